@@ -2,6 +2,8 @@
 #ifndef VRKFRAMEWORK_BASIC_KUBO_KUBO_H
 #define VRKFRAMEWORK_BASIC_KUBO_KUBO_H
 
+#include "vrkframework/basic/core/typeconv/typelist.h"
+#include "vrkframework/basic/core/typedispatch/extendtypedispatch.h"
 #include "vrkframework/basic/kubo/kuboapi.h"
 #include "vrkframework/basic/kubo/raster/datatype.h"
 #include "vrkframework/basic/kubo/raster/datatypeconstraints.h"

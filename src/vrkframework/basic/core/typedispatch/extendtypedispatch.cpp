@@ -1,0 +1,22 @@
+// The dispatcher's failures, out of line so that each of its many instances stays small.
+#include "vrkframework/basic/core/typedispatch/extendtypedispatch.h"
+
+#include "vrkframework/platform/exception.h"
+
+namespace kora::typedispatch::detail {
+namespace {
+
+constexpr char kSourcePath[] = "vrkframework/basic/core/typedispatch/extendtypedispatch";
+
+}  // namespace
+
+void ThrowNotEnoughTypes(unsigned int line, const char* function) {
+    throw kora::Exception("Not enough type in the vector for the dispatcher you are using.",
+                          kSourcePath, function, line);
+}
+
+void ThrowInvalidType(const char* function) {
+    throw kora::Exception("Invalid type requested.", kSourcePath, function, 175);
+}
+
+}  // namespace kora::typedispatch::detail
