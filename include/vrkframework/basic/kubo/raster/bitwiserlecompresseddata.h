@@ -1,0 +1,98 @@
+// A raster's bytes compressed as alternating runs of zero and one bits, decodable whole or
+// by window through a seeking read cursor.
+#ifndef VRKFRAMEWORK_BASIC_KUBO_RASTER_BITWISERLECOMPRESSEDDATA_H
+#define VRKFRAMEWORK_BASIC_KUBO_RASTER_BITWISERLECOMPRESSEDDATA_H
+
+#include <cstddef>  // std::size_t
+#include <cstdint>  // std::uint32_t, std::uint64_t
+#include <memory>   // std::shared_ptr
+
+#include "vrkframework/basic/kubo/kuboapi.h"
+#include "vrkframework/basic/kubo/raster/datatype.h"
+#include "vrkframework/basic/kubo/raster/icompresseddata.h"
+#include "vrkframework/basic/kubo/raster/rasterinfo.h"
+
+namespace kora::kubo {
+
+/// The raw bytes of a raster (no margins) read as a bit stream, most significant bit of
+/// each byte first, and stored as run lengths of one byte each: run k counts bits of
+/// value k mod 2. A run of 0 appears first when the stream starts with a one bit, and
+/// after a run of 255 whose bits go on. An empty stream is the single run 0. It suits
+/// masks and other data with long stretches of equal bits.
+///
+/// One sample takes (bits + 7) / 8 bytes, whatever the complex flag says. The inherited
+/// RasterInfo part stays zero, except that copies take it from their source.
+///
+/// Copies share the runs (they never change after construction); the last holder
+/// releases them. Each object has its own read cursor, which the window decoder moves
+/// although it is const: one object must not be decoded by window from two threads at
+/// once. Moving copies, so the source stays usable.
+class KUBO_API BitwiseRLECompressedData : public ICompressedData {
+public:
+    /// Compresses width x height x channels x ((bits + 7) / 8) bytes of `buffer`; the
+    /// buffer is not kept.
+    /// @throws kora::DataException when `buffer` is null.
+    BitwiseRLECompressedData(unsigned char* buffer, RasterInfo& info);
+    BitwiseRLECompressedData(const BitwiseRLECompressedData& other);
+    BitwiseRLECompressedData& operator=(const BitwiseRLECompressedData& other);
+    BitwiseRLECompressedData(BitwiseRLECompressedData&& other) noexcept;
+    BitwiseRLECompressedData& operator=(BitwiseRLECompressedData&& other) noexcept;
+    ~BitwiseRLECompressedData() override;
+
+    unsigned int GetWidth() const { return m_info.width; }
+    unsigned int GetHeight() const { return m_info.height; }
+    unsigned int GetChansCount() const { return m_info.channels; }
+    const DataType& GetDataType() const { return m_info.dataType; }
+    /// The runs; valid as long as one copy of this object lives.
+    const unsigned char* GetCompressedData() const { return m_buffer.get(); }
+    /// Number of runs (bytes).
+    unsigned int GetCompressedSize() const { return static_cast<unsigned int>(m_size); }
+
+    /// A new buffer of the whole raster's size holding the whole raster.
+    unsigned char* Decode() const override;
+    /// A new buffer of the whole raster's size holding the window decoded as by
+    /// Decode(x, y, w, h, out); writing stops at the end of the buffer.
+    unsigned char* Decode(int x, int y, int w, int h) const override;
+    /// For each row r from y to y + h - 1, reads the w bytes from byte x of row r into
+    /// `out`, the rows w x bytes-per-sample x channels bytes apart: x and w count bytes
+    /// where they are read and pixels where they are checked and placed, which agree for
+    /// one channel of one byte. `out` must hold (h - 1) x that spacing + w bytes. The
+    /// cursor stays where the last row ended, so a later window seeks on from there.
+    /// @throws kora::OutOfBoundsException {x, y, w, w} unless y < height, y + h <=
+    ///   height, x < width and x + w <= width (checked first; negative x or y pass).
+    /// @throws kora::DataException when `out` is null, or when a row starts past the
+    ///   start of the last run ("Uncompressed index not found."): the cursor seeks run by
+    ///   run and cannot step back once it has jumped past the last one.
+    void Decode(int x, int y, int w, int h, unsigned char* out) const override;
+    /// Expands every run into `out`, which holds the whole raster; the cursor is not used.
+    /// @throws kora::DataException when `out` is null.
+    void Decode(unsigned char* out) const override;
+
+private:
+    void Compress(unsigned char* buffer, unsigned long bitCount);
+    unsigned long GetLineSize() const;
+    unsigned long GetBufferSizeBytes() const;
+    void DecodeWindow(int x, int y, int w, int h, unsigned char* out, std::size_t capacity) const;
+
+    // The read cursor.
+    void ResetSeek() const;
+    void Jump() const;
+    void Seek(unsigned long bit) const;
+    void EnterUnreadRun() const;
+    void ReadBit(unsigned char* dst, int k) const;
+    void ReadByte(unsigned char* dst) const;
+    void Read(unsigned long byteOffset, unsigned long byteCount, unsigned char* dst) const;
+
+    std::shared_ptr<unsigned char> m_buffer;
+    std::size_t m_size;
+    RasterInfo m_info;
+    mutable std::size_t m_runIndex;     ///< the current run
+    mutable std::uint64_t m_position;   ///< the next bit to read
+    mutable std::uint32_t m_runLength;  ///< length of the current run
+    mutable std::uint32_t m_consumed;   ///< bits of the current run already read
+    mutable bool m_bitValue;            ///< value of the current run's bits
+};
+
+}  // namespace kora::kubo
+
+#endif  // VRKFRAMEWORK_BASIC_KUBO_RASTER_BITWISERLECOMPRESSEDDATA_H

@@ -1,0 +1,273 @@
+// Bit-run compression of raw raster bytes, the whole decoder and the window decoder with
+// its seeking read cursor.
+#include "vrkframework/basic/kubo/raster/bitwiserlecompresseddata.h"
+
+#include <algorithm>  // std::min
+#include <cstdint>    // SIZE_MAX
+#include <cstring>    // std::memcpy, std::memset
+
+#include "vrkframework/basic/kubo/raster/alternatingruns.h"
+#include "vrkframework/basic/kubo/raster/bytesink.h"
+#include "vrkframework/basic/kubo/raster/wordscan.h"
+#include "vrkframework/platform/exception.h"
+
+namespace kora::kubo {
+namespace {
+
+constexpr char kSourcePath[] = "vrkframework/basic/kubo/raster/bitwiserlecompresseddata";
+constexpr char kIndexNotFound[] = "Uncompressed index not found.";
+constexpr char kWindowDecode[] =
+    "void __cdecl kora::kubo::BitwiseRLECompressedData::Decode(int,int,int,int,unsigned char *) "
+    "const";
+
+// Writes runs of bits into bytes, most significant bit first: bits gather in a word, and
+// whole words of one value go out as one fill.
+class BitWriter {
+public:
+    explicit BitWriter(unsigned char* out) : m_out(out) {}
+
+    void Put(std::uint64_t length, bool value) {
+        while (length > 0) {
+            if (m_filled == 0 && length >= 64) {
+                const auto bytes = static_cast<std::size_t>(length / 64 * 8);
+                std::memset(m_out, value ? 0xFF : 0, bytes);
+                m_out += bytes;
+                length %= 64;
+                continue;
+            }
+            const auto take =
+                static_cast<unsigned int>(std::min<std::uint64_t>(length, 64 - m_filled));
+            if (value) {
+                m_word |= (~std::uint64_t{0} >> (64 - take)) << (64 - m_filled - take);
+            }
+            m_filled += take;
+            length -= take;
+            if (m_filled == 64) {
+                Store(8);
+            }
+        }
+    }
+
+    // The stream holds whole bytes, so nothing is left over.
+    void Finish() { Store(m_filled / 8); }
+
+private:
+    void Store(unsigned int bytes) {
+        const std::uint64_t ordered = detail::kLittleEndian ? detail::ByteSwap(m_word) : m_word;
+        std::memcpy(m_out, &ordered, bytes);
+        m_out += bytes;
+        m_word = 0;
+        m_filled = 0;
+    }
+
+    unsigned char* m_out;
+    std::uint64_t m_word = 0;
+    unsigned int m_filled = 0;
+};
+
+}  // namespace
+
+BitwiseRLECompressedData::BitwiseRLECompressedData(unsigned char* buffer, RasterInfo& info)
+    : m_size(0),
+      m_info(info),
+      m_runIndex(0),
+      m_position(0),
+      m_runLength(0),
+      m_consumed(0),
+      m_bitValue(false) {
+    if (buffer == nullptr) {
+        throw kora::DataException("pBuffer is NULL, cannot compress NULL buffer", kSourcePath,
+                                  "__cdecl kora::kubo::BitwiseRLECompressedData::"
+                                  "BitwiseRLECompressedData(unsigned char *,class "
+                                  "kora::kubo::RasterInfo &)",
+                                  25);
+    }
+    Compress(buffer, GetBufferSizeBytes() * 8);
+    ResetSeek();
+}
+
+BitwiseRLECompressedData::BitwiseRLECompressedData(const BitwiseRLECompressedData& other) = default;
+BitwiseRLECompressedData& BitwiseRLECompressedData::operator=(
+    const BitwiseRLECompressedData& other) = default;
+BitwiseRLECompressedData::BitwiseRLECompressedData(BitwiseRLECompressedData&& other) noexcept
+    : BitwiseRLECompressedData(static_cast<const BitwiseRLECompressedData&>(other)) {}
+BitwiseRLECompressedData& BitwiseRLECompressedData::operator=(
+    BitwiseRLECompressedData&& other) noexcept {
+    return *this = static_cast<const BitwiseRLECompressedData&>(other);
+}
+BitwiseRLECompressedData::~BitwiseRLECompressedData() = default;
+
+void BitwiseRLECompressedData::Compress(unsigned char* buffer, unsigned long bitCount) {
+    // Sized for smooth data at first; noise grows it.
+    detail::ByteSink sink(bitCount / 128 + 16);
+    detail::AppendAlternatingRuns(
+        bitCount,
+        [&](std::uint64_t position, bool value) {
+            return detail::FindBitChange(buffer, position, bitCount, value);
+        },
+        sink);
+    m_size = sink.Size();
+    m_buffer = sink.Release();
+}
+
+unsigned long BitwiseRLECompressedData::GetLineSize() const {
+    return static_cast<unsigned long>((m_info.dataType.bits + 7u) / 8u) * m_info.channels *
+           m_info.width;
+}
+
+unsigned long BitwiseRLECompressedData::GetBufferSizeBytes() const {
+    return GetLineSize() * m_info.height;
+}
+
+unsigned char* BitwiseRLECompressedData::Decode() const {
+    auto* out = new unsigned char[GetBufferSizeBytes()];
+    Decode(out);
+    return out;
+}
+
+unsigned char* BitwiseRLECompressedData::Decode(int x, int y, int w, int h) const {
+    const unsigned long size = GetBufferSizeBytes();
+    std::unique_ptr<unsigned char[]> out(new unsigned char[size]);
+    DecodeWindow(x, y, w, h, out.get(), size);
+    return out.release();
+}
+
+void BitwiseRLECompressedData::Decode(unsigned char* out) const {
+    if (out == nullptr) {
+        throw kora::DataException(
+            "pBuffer is NULL, cannot Decode in NULL buffer", kSourcePath,
+            "void __cdecl kora::kubo::BitwiseRLECompressedData::Decode(unsigned char *) const",
+            128);
+    }
+    const unsigned char* runs = m_buffer.get();
+    BitWriter writer(out);
+    for (std::size_t run = 0; run < m_size;) {
+        const bool value = detail::RunValue(run);
+        writer.Put(detail::NextStretch(runs, m_size, run), value);
+    }
+    writer.Finish();
+}
+
+void BitwiseRLECompressedData::Decode(int x, int y, int w, int h, unsigned char* out) const {
+    DecodeWindow(x, y, w, h, out, SIZE_MAX);
+}
+
+void BitwiseRLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* out,
+                                            std::size_t capacity) const {
+    // Sums in 64 bits, so that no sum wraps into the raster.
+    const long long columns = m_info.width;
+    const long long rows = m_info.height;
+    if (!(y < rows && static_cast<long long>(y) + h <= rows && x < columns &&
+          static_cast<long long>(x) + w <= columns)) {
+        throw kora::OutOfBoundsException({x, y, w, w},
+                                         "Window is not in include in this compressed raster",
+                                         kSourcePath, kWindowDecode, 190);
+    }
+    if (out == nullptr) {
+        throw kora::DataException("pBuffer is NULL, cannot compress NULL buffer", kSourcePath,
+                                  kWindowDecode, 196);
+    }
+    // A negative width reads nothing; a negative x or y wraps the offset as unsigned.
+    const std::size_t rowBytes = w > 0 ? static_cast<std::size_t>(w) : 0;
+    const std::size_t spacing =
+        rowBytes * ((m_info.dataType.bits + 7u) / 8u) * std::size_t{m_info.channels};
+    std::size_t o = 0;
+    for (long long row = y; row < static_cast<long long>(y) + h && o < capacity;
+         ++row, o += spacing) {
+        Read(static_cast<unsigned long>(row) * GetLineSize() + static_cast<unsigned long>(x),
+             static_cast<unsigned long>(std::min(rowBytes, capacity - o)), out + o);
+    }
+}
+
+void BitwiseRLECompressedData::ResetSeek() const {
+    m_runIndex = 0;
+    m_position = 0;
+    m_runLength = m_buffer.get()[0];
+    m_consumed = 0;
+    m_bitValue = false;
+}
+
+void BitwiseRLECompressedData::Jump() const {
+    m_position += m_runLength - m_consumed;
+    ++m_runIndex;
+    if (m_runIndex >= m_size) {
+        throw kora::DataException(
+            kIndexNotFound, kSourcePath,
+            "void __cdecl kora::kubo::BitwiseRLECompressedData::Jump(void) const", 343);
+    }
+    m_runLength = m_buffer.get()[m_runIndex];
+    m_consumed = 0;
+    m_bitValue = !m_bitValue;
+}
+
+void BitwiseRLECompressedData::Seek(unsigned long bit) const {
+    if (bit < m_position) {
+        ResetSeek();
+    }
+    while (m_position < bit && m_runIndex < m_size) {
+        Jump();
+    }
+    // Reached only when an earlier failed jump left the cursor past the last run.
+    if (m_runIndex >= m_size) {
+        throw kora::DataException(
+            kIndexNotFound, kSourcePath,
+            "void __cdecl kora::kubo::BitwiseRLECompressedData::Seek(unsigned long) const", 318);
+    }
+    if (m_position == bit) {
+        return;
+    }
+    // The last jump passed the bit: step back into the run that holds it.
+    --m_runIndex;
+    m_runLength = m_buffer.get()[m_runIndex];
+    m_consumed = static_cast<std::uint32_t>(m_runLength - (m_position - bit));
+    m_position = bit;
+    m_bitValue = !m_bitValue;
+}
+
+void BitwiseRLECompressedData::EnterUnreadRun() const {
+    if (m_consumed >= m_runLength) {
+        Jump();
+        if (m_runLength == 0) {  // a separator: the value goes on in the run after it
+            Jump();
+        }
+    }
+}
+
+void BitwiseRLECompressedData::ReadBit(unsigned char* dst, int k) const {
+    EnterUnreadRun();
+    const auto mask = static_cast<unsigned char>(0x80u >> k);
+    *dst = static_cast<unsigned char>(m_bitValue ? *dst | mask : *dst & ~mask);
+    ++m_consumed;
+    ++m_position;
+}
+
+void BitwiseRLECompressedData::ReadByte(unsigned char* dst) const {
+    unsigned char byte = 0;
+    for (int k = 0; k < 8; ++k) {
+        ReadBit(&byte, k);
+    }
+    *dst = byte;
+}
+
+void BitwiseRLECompressedData::Read(unsigned long byteOffset, unsigned long byteCount,
+                                    unsigned char* dst) const {
+    Seek(byteOffset * 8);
+    // Reads stay byte-aligned: whole bytes inside one run go out as a fill, a byte that
+    // straddles runs bit by bit.
+    for (unsigned long i = 0; i < byteCount;) {
+        EnterUnreadRun();
+        const unsigned long whole =
+            std::min<unsigned long>((m_runLength - m_consumed) / 8, byteCount - i);
+        if (whole == 0) {
+            ReadByte(dst + i);
+            ++i;
+            continue;
+        }
+        std::memset(dst + i, m_bitValue ? 0xFF : 0, whole);
+        m_consumed += static_cast<std::uint32_t>(8 * whole);
+        m_position += 8 * whole;
+        i += whole;
+    }
+}
+
+}  // namespace kora::kubo

@@ -1,0 +1,201 @@
+// Row-by-row run compression of a two-valued mask, and its row, partial-row, whole and
+// window decoders.
+#include "vrkframework/basic/kubo/raster/linerlecompressedbitmask.h"
+
+#include <algorithm>  // std::min
+#include <climits>    // ULONG_MAX
+#include <cstdint>    // std::uint64_t
+#include <cstring>    // std::memcpy
+#include <utility>    // std::move
+#include <vector>
+
+#include "vrkframework/basic/kubo/raster/alternatingruns.h"
+#include "vrkframework/basic/kubo/raster/bytefill.h"
+#include "vrkframework/basic/kubo/raster/bytesink.h"
+#include "vrkframework/basic/kubo/raster/wordscan.h"
+#include "vrkframework/platform/exception.h"
+
+namespace kora::kubo {
+namespace {
+
+constexpr char kSourcePath[] = "vrkframework/basic/kubo/raster/linerlecompressedbitmask";
+constexpr char kNullOutput[] = "pBuffer is NULL, cannot Decode in NULL buffer";
+
+}  // namespace
+
+/// One run stream per row (null while the row is empty) and its size.
+struct LineRLECompressedBitMask::RowTable {
+    explicit RowTable(unsigned int height) : rows(height), sizes(height, 0u) {}
+
+    std::vector<std::unique_ptr<unsigned char[]>> rows;
+    std::vector<unsigned int> sizes;
+};
+
+LineRLECompressedBitMask::LineRLECompressedBitMask(unsigned int maskWidth, unsigned int maskHeight)
+    : m_rows(std::make_shared<RowTable>(maskHeight)),
+      m_info(maskWidth, maskHeight, 1, DataType::Type1U) {}
+
+LineRLECompressedBitMask::LineRLECompressedBitMask(Raster& raster)
+    : LineRLECompressedBitMask(raster.width, raster.height) {
+    // Rasters place a pixel at its bit offset divided by 8.
+    const std::uint64_t pixelBits = std::uint64_t{raster.channels} * raster.dataType.bits *
+                                    (raster.dataType.isComplex ? 2u : 1u);
+    for (unsigned int row = 0; row < raster.height; ++row) {
+        const std::uint64_t pixel =
+            (std::uint64_t{raster.yMargin} + row) * raster.lineStride + raster.xMargin;
+        CompressRow(raster.data + pixel * pixelBits / 8, row);
+    }
+}
+
+LineRLECompressedBitMask::LineRLECompressedBitMask(const LineRLECompressedBitMask& other) = default;
+LineRLECompressedBitMask& LineRLECompressedBitMask::operator=(
+    const LineRLECompressedBitMask& other) = default;
+LineRLECompressedBitMask::LineRLECompressedBitMask(LineRLECompressedBitMask&& other) noexcept
+    : LineRLECompressedBitMask(static_cast<const LineRLECompressedBitMask&>(other)) {}
+LineRLECompressedBitMask& LineRLECompressedBitMask::operator=(
+    LineRLECompressedBitMask&& other) noexcept {
+    return *this = static_cast<const LineRLECompressedBitMask&>(other);
+}
+LineRLECompressedBitMask::~LineRLECompressedBitMask() = default;
+
+unsigned long LineRLECompressedBitMask::GetBytesPerPixel() const {
+    return (m_info.dataType.bits + 7u) / 8u;
+}
+
+unsigned long LineRLECompressedBitMask::GetRowSize() const {
+    return GetBytesPerPixel() * m_info.channels * m_info.width;
+}
+
+unsigned long LineRLECompressedBitMask::GetBufferSize() const {
+    return GetRowSize() * m_info.height;
+}
+
+const unsigned char* LineRLECompressedBitMask::GetCompressedRow(unsigned long row) const {
+    return row < m_info.height ? m_rows->rows[row].get() : nullptr;
+}
+
+unsigned int LineRLECompressedBitMask::GetCompressedRowSize(unsigned long row) const {
+    return row < m_info.height ? m_rows->sizes[row] : 0u;
+}
+
+std::unique_ptr<unsigned char[]> LineRLECompressedBitMask::Compress(unsigned char* data,
+                                                                    unsigned long count,
+                                                                    unsigned long& size) {
+    detail::ByteSink sink(count + 1);  // the most a row can take
+    detail::AppendAlternatingRuns(
+        count,
+        [&](std::uint64_t position, bool set) {
+            const auto begin = static_cast<std::size_t>(position);
+            return set ? detail::FindZeroByte(data, begin, count)
+                       : detail::FindByteChange(data, begin, count, 0);
+        },
+        sink);
+    size = static_cast<unsigned long>(sink.Size());
+    std::unique_ptr<unsigned char[]> runs(new unsigned char[size]);
+    std::memcpy(runs.get(), sink.Data(), size);
+    return runs;
+}
+
+void LineRLECompressedBitMask::CompressRow(unsigned char* data, unsigned long row) {
+    if (row >= m_info.height) {
+        return;
+    }
+    unsigned long size = 0;
+    m_rows->rows[row] = Compress(data, GetRowSize(), size);
+    m_rows->sizes[row] = static_cast<unsigned int>(size);
+}
+
+unsigned char* LineRLECompressedBitMask::DecodeRow(unsigned long row) const {
+    auto* out = new unsigned char[GetRowSize()];
+    DecodeRow(row, out);
+    return out;
+}
+
+void LineRLECompressedBitMask::DecodeRow(unsigned long row, unsigned char* out) const {
+    DecodePartialRow(row, 0, GetRowSize(), out);
+}
+
+void LineRLECompressedBitMask::DecodePartialRow(unsigned long row, unsigned long start,
+                                                unsigned long count, unsigned char* out) const {
+    const unsigned char* runs = GetCompressedRow(row);
+    const std::size_t runCount = GetCompressedRowSize(row);
+    std::size_t run = 0;
+    unsigned long written = 0;
+    if (start != 0) {
+        std::uint64_t sum = 0;
+        while (sum < start && run < runCount) {
+            sum += runs[run++];
+        }
+        if (sum < start) {
+            throw kora::DataException(
+                "Uncompressed index not found.", kSourcePath,
+                "void __cdecl kora::kubo::LineRLECompressedBitMask::DecodePartialRow(unsigned "
+                "long,unsigned long,unsigned long,unsigned char *) const",
+                327);
+        }
+        // Pixel `start` lies in the last run added; the rest of that run comes first.
+        written = static_cast<unsigned long>(std::min<std::uint64_t>(sum - start, count));
+        detail::FillBytes(out, detail::RunValue(run - 1), written);
+    }
+    while (written < count && run < runCount) {
+        const bool value = detail::RunValue(run);
+        const auto length = static_cast<unsigned long>(
+            std::min<std::uint64_t>(detail::NextStretch(runs, runCount, run), count - written));
+        detail::FillBytes(out + written, value, length);
+        written += length;
+    }
+    detail::FillBytes(out + written, 0, count - written);  // past the runs: clear
+}
+
+unsigned char* LineRLECompressedBitMask::Decode() const {
+    auto* out = new unsigned char[GetBufferSize()];
+    Decode(out);
+    return out;
+}
+
+unsigned char* LineRLECompressedBitMask::Decode(int x, int y, int w, int h) const {
+    const unsigned long size = GetBufferSize();
+    std::unique_ptr<unsigned char[]> out(new unsigned char[size]);
+    DecodeWindow(x, y, w, h, out.get(), size);
+    return out.release();
+}
+
+void LineRLECompressedBitMask::Decode(unsigned char* out) const {
+    if (out == nullptr) {
+        throw kora::DataException(
+            kNullOutput, kSourcePath,
+            "void __cdecl kora::kubo::LineRLECompressedBitMask::Decode(unsigned char *) const",
+            177);
+    }
+    for (unsigned int row = 0; row < m_info.height; ++row) {
+        DecodePartialRow(row, 0, m_info.width, out + row * GetRowSize());
+    }
+}
+
+void LineRLECompressedBitMask::Decode(int x, int y, int w, int h, unsigned char* out) const {
+    if (out == nullptr) {
+        throw kora::DataException(kNullOutput, kSourcePath,
+                                  "void __cdecl kora::kubo::LineRLECompressedBitMask::Decode(int,"
+                                  "int,int,int,unsigned char *) const",
+                                  210);
+    }
+    DecodeWindow(x, y, w, h, out, ULONG_MAX);
+}
+
+void LineRLECompressedBitMask::DecodeWindow(int x, int y, int w, int h, unsigned char* out,
+                                            unsigned long capacity) const {
+    const unsigned long count = w > 0 ? static_cast<unsigned long>(w) : 0;
+    if (count == 0 && x == 0) {
+        return;  // nothing to write and no start to look for, however many rows
+    }
+    // A negative x wraps to a start past every row, a negative row to an index past the
+    // last one; the sum is 64-bit so that it cannot wrap.
+    unsigned long o = 0;
+    for (long long row = y; row < static_cast<long long>(y) + h && o < capacity;
+         ++row, o += count * GetBytesPerPixel()) {
+        DecodePartialRow(static_cast<unsigned long>(row), static_cast<unsigned long>(x),
+                         std::min(count, capacity - o), out + o);
+    }
+}
+
+}  // namespace kora::kubo

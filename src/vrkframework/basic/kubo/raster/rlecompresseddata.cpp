@@ -1,0 +1,195 @@
+// (count, value) pair compression of raw raster bytes, and its whole and window decoders.
+#include "vrkframework/basic/kubo/raster/rlecompresseddata.h"
+
+#include <algorithm>  // std::min
+#include <cstdint>    // std::uint32_t, std::uint64_t
+
+#include "vrkframework/basic/kubo/raster/bytefill.h"
+#include "vrkframework/basic/kubo/raster/bytesink.h"
+#include "vrkframework/basic/kubo/raster/wordscan.h"
+#include "vrkframework/platform/exception.h"
+
+namespace kora::kubo {
+namespace {
+
+constexpr char kSourcePath[] = "vrkframework/basic/kubo/raster/rlecompresseddata";
+constexpr char kNullOutput[] = "pBuffer is NULL, cannot Decode in NULL buffer";
+
+detail::EncodedBytes EncodePairs(const unsigned char* in, std::size_t count, std::size_t& size) {
+    detail::ByteSink sink(2 * count);
+    unsigned char* out = sink.Reserve(2 * count);
+    for (std::size_t i = 0; i < count;) {
+        const unsigned char value = in[i];
+        std::size_t end = i + 1;
+        if (end < count && in[end] == value) {
+            end = detail::FindByteChange(in, end + 1, count, value);
+        }
+        std::size_t length = end - i;
+        for (; length > 255; length -= 255) {
+            out[0] = 255;
+            out[1] = value;
+            out += 2;
+        }
+        out[0] = static_cast<unsigned char>(length);
+        out[1] = value;
+        out += 2;
+        i = end;
+    }
+    sink.Commit(out);
+    size = sink.Size();
+    return sink.Release();
+}
+
+// The pairs as the window decoder sees them: outside the stream every pair is empty with
+// value 0, so that an unchecked window never reads past the stream.
+class PairStream {
+public:
+    PairStream(const unsigned char* pairs, std::size_t bytes)
+        : m_pairs(pairs), m_count(bytes / 2) {}
+
+    std::size_t Size() const { return m_count; }
+    std::uint32_t Count(std::size_t pair) const { return pair < m_count ? m_pairs[2 * pair] : 0u; }
+    unsigned char Value(std::size_t pair) const {
+        return pair < m_count ? m_pairs[2 * pair + 1] : 0;
+    }
+
+    // The counts of the four pairs from `pair` on (all within the stream), summed in the
+    // 16-bit lanes of one word.
+    std::uint32_t SumOfFour(std::size_t pair) const {
+        const std::uint64_t counts =
+            detail::LoadLowFirst(m_pairs + 2 * pair) & 0x00FF00FF00FF00FFull;
+        return static_cast<std::uint32_t>((counts * 0x0001000100010001ull) >> 48);
+    }
+
+private:
+    const unsigned char* m_pairs;
+    std::size_t m_count;
+};
+
+}  // namespace
+
+RLECompressedData::RLECompressedData(unsigned char* buffer, RasterInfo& info,
+                                     RasterContext& context)
+    : m_info(info.width + 2 * context.xMargin, info.height + 2 * context.yMargin, info.channels,
+             info.dataType),
+      m_size(0) {
+    if (buffer == nullptr) {
+        throw kora::DataException("pBuffer is NULL, cannot compress NULL buffer", kSourcePath,
+                                  "__cdecl kora::kubo::RLECompressedData::RLECompressedData("
+                                  "unsigned char *,class kora::kubo::RasterInfo &,class "
+                                  "kora::kubo::RasterContext &)",
+                                  30);
+    }
+    m_buffer = EncodePairs(buffer, GetRasterSize(), m_size);
+}
+
+RLECompressedData::RLECompressedData(const RLECompressedData& other) = default;
+RLECompressedData& RLECompressedData::operator=(const RLECompressedData& other) = default;
+RLECompressedData::RLECompressedData(RLECompressedData&& other) noexcept
+    : RLECompressedData(static_cast<const RLECompressedData&>(other)) {}
+RLECompressedData& RLECompressedData::operator=(RLECompressedData&& other) noexcept {
+    return *this = static_cast<const RLECompressedData&>(other);
+}
+RLECompressedData::~RLECompressedData() = default;
+
+std::size_t RLECompressedData::GetRasterSize() const {
+    return std::size_t{m_info.width} * m_info.height * m_info.channels *
+           ((m_info.dataType.bits + 7u) / 8u);
+}
+
+unsigned char* RLECompressedData::Decode() const {
+    auto* out = new unsigned char[GetRasterSize()];
+    Decode(out);
+    return out;
+}
+
+unsigned char* RLECompressedData::Decode(int x, int y, int w, int h) const {
+    const std::size_t size = GetRasterSize();
+    std::unique_ptr<unsigned char[]> out(new unsigned char[size]);
+    DecodeWindow(x, y, w, h, out.get(), size);
+    return out.release();
+}
+
+void RLECompressedData::Decode(unsigned char* out) const {
+    if (out == nullptr) {
+        throw kora::DataException(
+            kNullOutput, kSourcePath,
+            "void __cdecl kora::kubo::RLECompressedData::Decode(unsigned char *) const", 107);
+    }
+    const unsigned char* pair = m_buffer.get();
+    const unsigned char* const end = pair + m_size;
+    while (pair != end) {
+        // Pairs of one value split at 255 are joined into one fill.
+        const unsigned char value = pair[1];
+        std::size_t length = pair[0];
+        for (pair += 2; pair != end && pair[1] == value; pair += 2) {
+            length += pair[0];
+        }
+        detail::FillBytes(out, value, length);
+        out += length;
+    }
+}
+
+void RLECompressedData::Decode(int x, int y, int w, int h, unsigned char* out) const {
+    if (out == nullptr) {
+        throw kora::DataException(kNullOutput, kSourcePath,
+                                  "void __cdecl kora::kubo::RLECompressedData::Decode(int,int,int,"
+                                  "int,unsigned char *) const",
+                                  146);
+    }
+    DecodeWindow(x, y, w, h, out, SIZE_MAX);
+}
+
+void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* out,
+                                     std::size_t capacity) const {
+    if (h < 1 || w < 1) {
+        return;
+    }
+    // Positions, the running total and the run count-down are 32-bit unsigned and wrap
+    // as such; a negative x or y wraps into a position far out.
+    const std::uint32_t pixel = ((m_info.dataType.bits + 7u) / 8u) * m_info.channels;
+    const std::uint32_t stride = m_info.width * pixel;
+    std::uint32_t start =
+        (m_info.width * static_cast<std::uint32_t>(y) + static_cast<std::uint32_t>(x)) * pixel;
+    const auto rowBytes = static_cast<std::size_t>(w);
+    const PairStream pairs(m_buffer.get(), m_size);
+    std::size_t pair = 0;
+    std::uint32_t total = 0;
+    for (std::size_t o = 0; h > 0 && o < capacity; --h, o += rowBytes, start += stride) {
+        // Seek: add counts until the total passes the row's start, four pairs at a time
+        // while all four stay at or below it. Past the stream nothing is added.
+        while (total <= start && pair < pairs.Size()) {
+            if (pairs.Size() - pair >= 4 && std::uint64_t{total} + pairs.SumOfFour(pair) <= start) {
+                total += pairs.SumOfFour(pair);
+                pair += 4;
+            } else {
+                total += pairs.Count(pair++);
+            }
+        }
+        // The step back is taken on every row, also when the seek added nothing.
+        --pair;
+        std::uint32_t remaining = total - start;
+        unsigned char value = pairs.Value(pair);
+        total -= pairs.Count(pair);
+
+        unsigned char* row = out + o;
+        for (std::size_t left = std::min(rowBytes, capacity - o); left > 0;) {
+            if (remaining == 0) {
+                // The total grows by the count of the pair entered (not of the one left):
+                // the next row's seek is defined on that total.
+                remaining = pairs.Count(++pair);
+                value = pairs.Value(pair);
+                total += remaining;
+            }
+            // An empty pair (only past the stream) makes the count-down wrap, so its
+            // value covers the rest of the row.
+            const std::size_t run = remaining == 0 ? left : std::min<std::size_t>(remaining, left);
+            detail::FillBytes(row, value, run);
+            row += run;
+            left -= run;
+            remaining -= static_cast<std::uint32_t>(run);
+        }
+    }
+}
+
+}  // namespace kora::kubo

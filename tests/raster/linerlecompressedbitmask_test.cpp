@@ -1,0 +1,225 @@
+#include "vrkframework/basic/kubo/raster/linerlecompressedbitmask.h"
+
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <random>
+
+#include "support/compressedsamples.h"
+#include "support/expectfailure.h"
+
+namespace {
+
+using kora::kubo::DataType;
+using kora::kubo::LineRLECompressedBitMask;
+using kora::kubo::Raster;
+using kora::kubo::RasterContext;
+using kora::kubo::RasterInfo;
+using kubo_test::Bytes;
+
+constexpr char kSource[] = "vrkframework/basic/kubo/raster/linerlecompressedbitmask";
+
+// A mask of `bytes` (row after row) through the (width, height) constructor.
+LineRLECompressedBitMask MaskOf(Bytes bytes, unsigned int width, unsigned int height) {
+    LineRLECompressedBitMask mask(width, height);
+    for (unsigned int row = 0; row < height; ++row) {
+        mask.CompressRow(bytes.data() + std::size_t{row} * width, row);
+    }
+    return mask;
+}
+
+Bytes Runs(const LineRLECompressedBitMask& mask, unsigned long row) {
+    const unsigned char* runs = mask.GetCompressedRow(row);
+    return Bytes(runs, runs + mask.GetCompressedRowSize(row));
+}
+
+Bytes Flags(const Bytes& bytes) {
+    Bytes flags(bytes.size());
+    for (std::size_t i = 0; i < bytes.size(); ++i) {
+        flags[i] = bytes[i] != 0 ? 1 : 0;
+    }
+    return flags;
+}
+
+Bytes Window(const LineRLECompressedBitMask& mask, int x, int y, int w, int h) {
+    Bytes out(static_cast<std::size_t>(w * h) + 1, 0xEE);
+    mask.Decode(x, y, w, h, out.data());
+    EXPECT_EQ(out.back(), 0xEE) << "wrote past the window";
+    out.pop_back();
+    return out;
+}
+
+TEST(LineRLECompressedBitMask, RowsAreAlternatingRunsOfClearAndSetPixels) {
+    const LineRLECompressedBitMask mask = MaskOf({0, 0, 7, 7, 0, 200, 0, 0, 0, 0}, 5, 2);
+    EXPECT_EQ(Runs(mask, 0), (Bytes{2, 2, 1}));
+    EXPECT_EQ(Runs(mask, 1), (Bytes{0, 1, 4}));  // starts set
+    EXPECT_EQ(kubo_test::Take(mask.DecodeRow(0), 5), (Bytes{0, 0, 1, 1, 0}));
+    EXPECT_EQ(Runs(MaskOf(Bytes(300, 1), 300, 1), 0), (Bytes{0, 255, 0, 45}));
+    EXPECT_EQ(Runs(MaskOf(Bytes(510, 0), 510, 1), 0), (Bytes{255, 0, 255}));
+    EXPECT_EQ(Runs(MaskOf({}, 0, 2), 1), (Bytes{0}));
+}
+
+TEST(LineRLECompressedBitMask, DescriptionIsOneChannelOfOneBitAndTheInheritedPartStaysZero) {
+    LineRLECompressedBitMask mask(7, 3);
+    EXPECT_EQ(mask.GetWidth(), 7u);
+    EXPECT_EQ(mask.GetHeight(), 3u);
+    EXPECT_EQ(mask.GetChansCount(), 1u);
+    EXPECT_EQ(mask.GetDataType(), DataType(1, false, false, 1, 0, false));
+    EXPECT_EQ(mask.GetBytesPerPixel(), 1u);
+    EXPECT_EQ(mask.GetRowSize(), 7u);
+    EXPECT_EQ(mask.GetBufferSize(), 21u);
+    EXPECT_EQ(mask.width, 0u);
+    EXPECT_EQ(mask.dataType, DataType());
+    mask.channels = 4;
+    EXPECT_EQ(LineRLECompressedBitMask(mask).channels, 4u);
+}
+
+TEST(LineRLECompressedBitMask, ARasterIsReadFromItsVisibleArea) {
+    Raster raster(RasterInfo(4, 2, 1, DataType::Type8U), RasterContext(2, 1, 0, 0));
+    const Bytes bytes = {9, 9, 9, 9, 9, 9, 9, 9,  //
+                         9, 9, 0, 5, 5, 0, 9, 9,  //
+                         9, 9, 3, 0, 0, 0, 9, 9,  //
+                         9, 9, 9, 9, 9, 9, 9, 9};
+    std::copy(bytes.begin(), bytes.end(), raster.data);
+    const LineRLECompressedBitMask mask(raster);
+    EXPECT_EQ(mask.GetWidth(), 4u);
+    EXPECT_EQ(mask.GetHeight(), 2u);
+    EXPECT_EQ(kubo_test::Take(mask.Decode(), 8), (Bytes{0, 1, 1, 0, 1, 0, 0, 0}));
+
+    // Two channels: a row is read from its first pixel, one byte per mask pixel.
+    Raster pairs(RasterInfo(2, 2, 2, DataType::Type8U), RasterContext(1, 0, 0, 0));
+    const Bytes interleaved = {7, 7, 0, 4, 4, 0, 7, 7,  //
+                               7, 7, 4, 0, 0, 0, 7, 7};
+    std::copy(interleaved.begin(), interleaved.end(), pairs.data);
+    EXPECT_EQ(kubo_test::Take(LineRLECompressedBitMask(pairs).Decode(), 4), (Bytes{0, 1, 1, 0}));
+}
+
+TEST(LineRLECompressedBitMask, DecodingGivesZeroAndOneForAnyInputValues) {
+    const unsigned int width = 333;
+    const unsigned int height = 17;
+    unsigned int seed = 0;
+    for (const Bytes& bytes : {kubo_test::NoiseBytes(width * height, ++seed),
+                               kubo_test::RunBytes(width * height, ++seed, {0, 1, 77, 255}, 600),
+                               kubo_test::RunBytes(width * height, ++seed, {0, 2}, 4)}) {
+        const Bytes flags = Flags(bytes);
+        const LineRLECompressedBitMask mask = MaskOf(bytes, width, height);
+        EXPECT_EQ(kubo_test::Take(mask.Decode(), flags.size()), flags);
+        Bytes out(flags.size() + 1, 0xEE);
+        mask.Decode(out.data());
+        EXPECT_EQ(out.back(), 0xEE);
+        out.pop_back();
+        EXPECT_EQ(out, flags);
+        for (unsigned long row = 0; row < height; ++row) {
+            Bytes decoded(width, 0xEE);
+            mask.DecodeRow(row, decoded.data());
+            EXPECT_EQ(decoded, kubo_test::Slice(flags, width, 0, row, width, 1));
+        }
+    }
+}
+
+TEST(LineRLECompressedBitMask, WindowsAreSlicesOfTheMask) {
+    const unsigned int width = 700;
+    const unsigned int height = 12;
+    const Bytes flags = Flags(kubo_test::RunBytes(width * height, 4, {0, 1}, 400));
+    const LineRLECompressedBitMask mask = MaskOf(flags, width, height);
+    std::mt19937 random(5);
+    for (int i = 0; i < 300; ++i) {
+        const int x = static_cast<int>(random() % width);
+        const int y = static_cast<int>(random() % height);
+        const int w = static_cast<int>(random() % (width - static_cast<unsigned>(x) + 1));
+        const int h = static_cast<int>(random() % (height - static_cast<unsigned>(y) + 1));
+        ASSERT_EQ(
+            Window(mask, x, y, w, h),
+            kubo_test::Slice(flags, width, static_cast<std::size_t>(x), static_cast<std::size_t>(y),
+                             static_cast<std::size_t>(w), static_cast<std::size_t>(h)));
+    }
+    unsigned char* out = mask.Decode(699, 11, 1, 1);
+    EXPECT_EQ(out[0], flags.back());
+    out[flags.size() - 1] = 0;  // the buffer holds the whole mask
+    delete[] out;
+}
+
+TEST(LineRLECompressedBitMask, PartialRowsStartInsideARun) {
+    const LineRLECompressedBitMask mask = MaskOf({0, 0, 1, 1, 0}, 5, 1);
+    EXPECT_EQ(Window(mask, 3, 0, 2, 1), (Bytes{1, 0}));
+    EXPECT_EQ(Window(mask, 2, 0, 1, 1), (Bytes{1}));
+    // A start at the row's end is found when the runs add up to it exactly; pixels past
+    // the end read as clear.
+    EXPECT_EQ(Window(mask, 5, 0, 0, 1), Bytes());
+    EXPECT_EQ(Window(mask, 5, 0, 2, 1), (Bytes{0, 0}));
+    EXPECT_EQ(Window(mask, 3, 0, 4, 1), (Bytes{1, 0, 0, 0}));
+}
+
+TEST(LineRLECompressedBitMask, RowsWithoutRunsReadAsClear) {
+    LineRLECompressedBitMask mask(4, 3);
+    EXPECT_EQ(mask.GetCompressedRow(1), nullptr);
+    EXPECT_EQ(mask.GetCompressedRowSize(1), 0u);
+    Bytes row = {5, 0, 5, 5};
+    mask.CompressRow(row.data(), 1);
+    EXPECT_EQ(kubo_test::Take(mask.Decode(), 12), (Bytes{0, 0, 0, 0, 1, 0, 1, 1, 0, 0, 0, 0}));
+    // Rows past the last one store nothing and read as clear.
+    mask.CompressRow(row.data(), 3);
+    EXPECT_EQ(mask.GetCompressedRow(3), nullptr);
+    EXPECT_EQ(mask.GetCompressedRowSize(99), 0u);
+    EXPECT_EQ(kubo_test::Take(mask.DecodeRow(3), 4), Bytes(4, 0));
+    EXPECT_EQ(Window(mask, 0, 1, 4, 4), (Bytes{1, 0, 1, 1, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0}));
+    EXPECT_EQ(Window(mask, 0, -1, 2, 2), (Bytes{0, 0, 0, 0}));
+    // A window larger than the mask fills the allocated buffer and stops at its end.
+    EXPECT_EQ(kubo_test::Take(mask.Decode(0, 1, 1000, 5), 12),
+              (Bytes{1, 0, 1, 1, 0, 0, 0, 0, 0, 0, 0, 0}));
+}
+
+TEST(LineRLECompressedBitMask, ReplacingARowReleasesTheOldOneAndCopiesSeeTheNewOne) {
+    LineRLECompressedBitMask mask = MaskOf({0, 0, 1, 1, 1, 1}, 3, 2);
+    const LineRLECompressedBitMask copy(mask);
+    LineRLECompressedBitMask assigned(1, 1);
+    assigned = mask;
+    Bytes row = {1, 1, 0};
+    mask.CompressRow(row.data(), 0);
+    const LineRLECompressedBitMask* views[] = {&mask, &copy, &assigned};
+    for (const LineRLECompressedBitMask* view : views) {
+        EXPECT_EQ(view->GetCompressedRow(0), mask.GetCompressedRow(0));
+        EXPECT_EQ(kubo_test::Take(view->Decode(), 6), (Bytes{1, 1, 0, 1, 1, 1}));
+    }
+    auto source = std::make_unique<LineRLECompressedBitMask>(copy);
+    LineRLECompressedBitMask survivor(*source);
+    source.reset();
+    EXPECT_EQ(Runs(survivor, 1), (Bytes{0, 3}));
+    const auto& self = assigned;
+    assigned = self;
+    LineRLECompressedBitMask moved(std::move(assigned));
+    EXPECT_EQ(Runs(assigned, 0), Runs(moved, 0));  // NOLINT: still valid
+}
+
+TEST(LineRLECompressedBitMask, FailuresReportTheirPlace) {
+    const LineRLECompressedBitMask mask = MaskOf({0, 1, 1, 0, 0, 1}, 3, 2);
+    const auto whole = kubo_test::Catch<kora::DataException>([&] { mask.Decode(nullptr); });
+    ASSERT_TRUE(whole);
+    kubo_test::ExpectReport(
+        *whole, "pBuffer is NULL, cannot Decode in NULL buffer", kSource,
+        "void __cdecl kora::kubo::LineRLECompressedBitMask::Decode(unsigned char *) const", 177);
+
+    const auto window =
+        kubo_test::Catch<kora::DataException>([&] { mask.Decode(0, 0, 1, 1, nullptr); });
+    ASSERT_TRUE(window);
+    kubo_test::ExpectReport(*window, "pBuffer is NULL, cannot Decode in NULL buffer", kSource,
+                            "void __cdecl kora::kubo::LineRLECompressedBitMask::Decode(int,int,int,"
+                            "int,unsigned char *) const",
+                            210);
+
+    // A start past the row's runs, also a negative one, which wraps far out, and any
+    // start in a row that holds no runs.
+    for (const auto& start : {std::make_pair(4, 0), std::make_pair(-1, 0), std::make_pair(1, 2)}) {
+        Bytes out(4);
+        const auto partial = kubo_test::Catch<kora::DataException>(
+            [&] { mask.Decode(start.first, start.second, 1, 1, out.data()); });
+        ASSERT_TRUE(partial);
+        kubo_test::ExpectReport(*partial, "Uncompressed index not found.", kSource,
+                                "void __cdecl kora::kubo::LineRLECompressedBitMask::"
+                                "DecodePartialRow(unsigned long,unsigned long,unsigned "
+                                "long,unsigned char *) const",
+                                327);
+    }
+}
+
+}  // namespace
