@@ -179,7 +179,7 @@ void BitwiseRLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned
     }
 }
 
-void BitwiseRLECompressedData::ResetSeek() const {
+inline void BitwiseRLECompressedData::ResetSeek() const {
     m_runIndex = 0;
     m_position = 0;
     m_runLength = m_buffer.get()[0];
@@ -187,7 +187,7 @@ void BitwiseRLECompressedData::ResetSeek() const {
     m_bitValue = false;
 }
 
-void BitwiseRLECompressedData::Jump() const {
+inline void BitwiseRLECompressedData::Jump() const {
     m_position += m_runLength - m_consumed;
     ++m_runIndex;
     if (m_runIndex >= m_size) {
@@ -200,9 +200,25 @@ void BitwiseRLECompressedData::Jump() const {
     m_bitValue = !m_bitValue;
 }
 
-void BitwiseRLECompressedData::Seek(unsigned long bit) const {
+inline void BitwiseRLECompressedData::Seek(unsigned long bit) const {
     if (bit < m_position) {
         ResetSeek();
+    }
+    // Nine jumps at once while all of them stay below the bit and inside the stream: the
+    // position grows by the rest of this run and the next eight runs, and the value flips
+    // nine times.
+    const unsigned char* runs = m_buffer.get();
+    while (m_runIndex + 9 < m_size) {
+        const std::uint64_t next = m_position + (m_runLength - m_consumed) +
+                                   detail::SumOfEightBytes(runs + m_runIndex + 1);
+        if (next >= bit) {
+            break;
+        }
+        m_position = next;
+        m_runIndex += 9;
+        m_runLength = runs[m_runIndex];
+        m_consumed = 0;
+        m_bitValue = !m_bitValue;
     }
     while (m_position < bit && m_runIndex < m_size) {
         Jump();
@@ -224,7 +240,7 @@ void BitwiseRLECompressedData::Seek(unsigned long bit) const {
     m_bitValue = !m_bitValue;
 }
 
-void BitwiseRLECompressedData::EnterUnreadRun() const {
+inline void BitwiseRLECompressedData::EnterUnreadRun() const {
     if (m_consumed >= m_runLength) {
         Jump();
         if (m_runLength == 0) {  // a separator: the value goes on in the run after it
@@ -233,7 +249,7 @@ void BitwiseRLECompressedData::EnterUnreadRun() const {
     }
 }
 
-void BitwiseRLECompressedData::ReadBit(unsigned char* dst, int k) const {
+inline void BitwiseRLECompressedData::ReadBit(unsigned char* dst, int k) const {
     EnterUnreadRun();
     const auto mask = static_cast<unsigned char>(0x80u >> k);
     *dst = static_cast<unsigned char>(m_bitValue ? *dst | mask : *dst & ~mask);
@@ -241,7 +257,7 @@ void BitwiseRLECompressedData::ReadBit(unsigned char* dst, int k) const {
     ++m_position;
 }
 
-void BitwiseRLECompressedData::ReadByte(unsigned char* dst) const {
+inline void BitwiseRLECompressedData::ReadByte(unsigned char* dst) const {
     unsigned char byte = 0;
     for (int k = 0; k < 8; ++k) {
         ReadBit(&byte, k);
@@ -249,8 +265,8 @@ void BitwiseRLECompressedData::ReadByte(unsigned char* dst) const {
     *dst = byte;
 }
 
-void BitwiseRLECompressedData::Read(unsigned long byteOffset, unsigned long byteCount,
-                                    unsigned char* dst) const {
+inline void BitwiseRLECompressedData::Read(unsigned long byteOffset, unsigned long byteCount,
+                                           unsigned char* dst) const {
     Seek(byteOffset * 8);
     // Reads stay byte-aligned: whole bytes inside one run go out as a fill, a byte that
     // straddles runs bit by bit.

@@ -3,6 +3,8 @@
 #ifndef VRKFRAMEWORK_BASIC_KUBO_RASTER_BYTESINK_H
 #define VRKFRAMEWORK_BASIC_KUBO_RASTER_BYTESINK_H
 
+#include <sys/mman.h>
+
 #include <cstddef>  // std::size_t
 #include <cstdlib>  // std::malloc, std::realloc, std::free
 #include <memory>   // std::unique_ptr
@@ -23,7 +25,18 @@ using EncodedBytes = std::unique_ptr<unsigned char, FreeBytes>;
 /// would cost as much again as the encoding of incompressible data.
 class ByteSink {
 public:
-    explicit ByteSink(std::size_t capacity) { Grow(capacity); }
+    explicit ByteSink(std::size_t capacity) {
+        constexpr std::size_t kHuge = std::size_t{2} << 20;
+        if (capacity >= 4 * kHuge) {
+            capacity = (capacity + kHuge - 1) / kHuge * kHuge;
+            m_begin = m_end = static_cast<unsigned char*>(std::aligned_alloc(kHuge, capacity));
+            if (m_begin == nullptr) throw std::bad_alloc();
+            m_limit = m_begin + capacity;
+            madvise(m_begin, capacity, MADV_HUGEPAGE);
+            return;
+        }
+        Grow(capacity);
+    }
     ByteSink(const ByteSink&) = delete;
     ByteSink& operator=(const ByteSink&) = delete;
     ByteSink(ByteSink&&) = delete;

@@ -6,7 +6,7 @@
 #include <climits>    // ULONG_MAX
 #include <cstdint>    // std::uint64_t
 #include <cstring>    // std::memcpy
-#include <utility>    // std::move
+#include <utility>    // std::pair
 #include <vector>
 
 #include "vrkframework/basic/kubo/raster/alternatingruns.h"
@@ -21,11 +21,56 @@ namespace {
 constexpr char kSourcePath[] = "vrkframework/basic/kubo/raster/linerlecompressedbitmask";
 constexpr char kNullOutput[] = "pBuffer is NULL, cannot Decode in NULL buffer";
 
+// Writes pixels start to start + count - 1 of a row, one byte (0 or 1) each. Calls stay
+// inside this file, so that they are direct.
+void DecodeRuns(const unsigned char* runs, std::size_t runCount, unsigned long start,
+                unsigned long count, unsigned char* out) {
+    std::size_t run = 0;
+    unsigned long written = 0;
+    if (start != 0) {
+        std::uint64_t sum = 0;
+        // Eight runs at once while they all end before the start.
+        while (runCount - run >= 8 && sum + detail::SumOfEightBytes(runs + run) < start) {
+            sum += detail::SumOfEightBytes(runs + run);
+            run += 8;
+        }
+        while (sum < start && run < runCount) {
+            sum += runs[run++];
+        }
+        if (sum < start) {
+            throw kora::DataException(
+                "Uncompressed index not found.", kSourcePath,
+                "void __cdecl kora::kubo::LineRLECompressedBitMask::DecodePartialRow(unsigned "
+                "long,unsigned long,unsigned long,unsigned char *) const",
+                327);
+        }
+        // Pixel `start` lies in the last run added; the rest of that run comes first.
+        written = static_cast<unsigned long>(std::min<std::uint64_t>(sum - start, count));
+        detail::FillBytes(out, detail::RunValue(run - 1), written);
+    }
+    while (written < count && run < runCount) {
+        const bool value = detail::RunValue(run);
+        const auto length = static_cast<unsigned long>(
+            std::min<std::uint64_t>(detail::NextStretch(runs, runCount, run), count - written));
+        detail::FillBytes(out + written, value, length);
+        written += length;
+    }
+    detail::FillBytes(out + written, 0, count - written);  // past the runs: clear
+}
+
 }  // namespace
 
 /// One run stream per row (null while the row is empty) and its size.
 struct LineRLECompressedBitMask::RowTable {
     explicit RowTable(unsigned int height) : rows(height), sizes(height, 0u) {}
+
+    /// The runs of `row` and their number: none for a row not stored yet or past the last.
+    std::pair<const unsigned char*, std::size_t> Runs(unsigned long row) const {
+        if (row >= rows.size()) {
+            return {nullptr, 0};
+        }
+        return {rows[row].get(), sizes[row]};
+    }
 
     std::vector<std::unique_ptr<unsigned char[]>> rows;
     std::vector<unsigned int> sizes;
@@ -71,11 +116,11 @@ unsigned long LineRLECompressedBitMask::GetBufferSize() const {
 }
 
 const unsigned char* LineRLECompressedBitMask::GetCompressedRow(unsigned long row) const {
-    return row < m_info.height ? m_rows->rows[row].get() : nullptr;
+    return m_rows->Runs(row).first;
 }
 
 unsigned int LineRLECompressedBitMask::GetCompressedRowSize(unsigned long row) const {
-    return row < m_info.height ? m_rows->sizes[row] : 0u;
+    return static_cast<unsigned int>(m_rows->Runs(row).second);
 }
 
 std::unique_ptr<unsigned char[]> LineRLECompressedBitMask::Compress(unsigned char* data,
@@ -117,34 +162,8 @@ void LineRLECompressedBitMask::DecodeRow(unsigned long row, unsigned char* out) 
 
 void LineRLECompressedBitMask::DecodePartialRow(unsigned long row, unsigned long start,
                                                 unsigned long count, unsigned char* out) const {
-    const unsigned char* runs = GetCompressedRow(row);
-    const std::size_t runCount = GetCompressedRowSize(row);
-    std::size_t run = 0;
-    unsigned long written = 0;
-    if (start != 0) {
-        std::uint64_t sum = 0;
-        while (sum < start && run < runCount) {
-            sum += runs[run++];
-        }
-        if (sum < start) {
-            throw kora::DataException(
-                "Uncompressed index not found.", kSourcePath,
-                "void __cdecl kora::kubo::LineRLECompressedBitMask::DecodePartialRow(unsigned "
-                "long,unsigned long,unsigned long,unsigned char *) const",
-                327);
-        }
-        // Pixel `start` lies in the last run added; the rest of that run comes first.
-        written = static_cast<unsigned long>(std::min<std::uint64_t>(sum - start, count));
-        detail::FillBytes(out, detail::RunValue(run - 1), written);
-    }
-    while (written < count && run < runCount) {
-        const bool value = detail::RunValue(run);
-        const auto length = static_cast<unsigned long>(
-            std::min<std::uint64_t>(detail::NextStretch(runs, runCount, run), count - written));
-        detail::FillBytes(out + written, value, length);
-        written += length;
-    }
-    detail::FillBytes(out + written, 0, count - written);  // past the runs: clear
+    const auto runs = m_rows->Runs(row);
+    DecodeRuns(runs.first, runs.second, start, count, out);
 }
 
 unsigned char* LineRLECompressedBitMask::Decode() const {
@@ -167,8 +186,10 @@ void LineRLECompressedBitMask::Decode(unsigned char* out) const {
             "void __cdecl kora::kubo::LineRLECompressedBitMask::Decode(unsigned char *) const",
             177);
     }
+    const unsigned long rowSize = GetRowSize();
     for (unsigned int row = 0; row < m_info.height; ++row) {
-        DecodePartialRow(row, 0, m_info.width, out + row * GetRowSize());
+        const auto runs = m_rows->Runs(row);
+        DecodeRuns(runs.first, runs.second, 0, m_info.width, out + row * rowSize);
     }
 }
 
@@ -190,11 +211,13 @@ void LineRLECompressedBitMask::DecodeWindow(int x, int y, int w, int h, unsigned
     }
     // A negative x wraps to a start past every row, a negative row to an index past the
     // last one; the sum is 64-bit so that it cannot wrap.
+    const unsigned long spacing = count * GetBytesPerPixel();
     unsigned long o = 0;
     for (long long row = y; row < static_cast<long long>(y) + h && o < capacity;
-         ++row, o += count * GetBytesPerPixel()) {
-        DecodePartialRow(static_cast<unsigned long>(row), static_cast<unsigned long>(x),
-                         std::min(count, capacity - o), out + o);
+         ++row, o += spacing) {
+        const auto runs = m_rows->Runs(static_cast<unsigned long>(row));
+        DecodeRuns(runs.first, runs.second, static_cast<unsigned long>(x),
+                   std::min(count, capacity - o), out + o);
     }
 }
 

@@ -2,7 +2,8 @@
 #include "vrkframework/basic/kubo/raster/rlecompresseddata.h"
 
 #include <algorithm>  // std::min
-#include <cstdint>    // std::uint32_t, std::uint64_t
+#include <cstdint>    // std::uint16_t, std::uint32_t, std::uint64_t
+#include <cstring>    // std::memcpy
 
 #include "vrkframework/basic/kubo/raster/bytefill.h"
 #include "vrkframework/basic/kubo/raster/bytesink.h"
@@ -15,10 +16,62 @@ namespace {
 constexpr char kSourcePath[] = "vrkframework/basic/kubo/raster/rlecompresseddata";
 constexpr char kNullOutput[] = "pBuffer is NULL, cannot Decode in NULL buffer";
 
+// Noise is handled a block of single-byte runs at a time, through 16-bit lanes that hold
+// one (count, value) pair each; the loops are written for the compiler to vectorise.
+constexpr std::size_t kBlock = 32;
+constexpr unsigned int kCountShift = detail::kLittleEndian ? 0 : 8;
+constexpr unsigned int kValueShift = 8 - kCountShift;
+
+std::uint16_t LoadLane(const unsigned char* bytes) {
+    std::uint16_t lane;
+    std::memcpy(&lane, bytes, sizeof lane);
+    return lane;
+}
+
+// Writes the pairs (1, b) of the block's bytes when no byte equals its successor (the
+// byte after the block is read too).
+bool EncodeSingles(const unsigned char* in, unsigned char* out) {
+    unsigned char repeats = 0;
+    for (std::size_t k = 0; k < kBlock; ++k) {
+        repeats |= static_cast<unsigned char>(in[k] == in[k + 1]);
+    }
+    if (repeats != 0) {
+        return false;
+    }
+    for (std::size_t k = 0; k < kBlock; ++k) {
+        const auto lane =
+            static_cast<std::uint16_t>((1u << kCountShift) | (unsigned{in[k]} << kValueShift));
+        std::memcpy(out + 2 * k, &lane, sizeof lane);
+    }
+    return true;
+}
+
+// Writes the values of a block of pairs when every count is 1.
+bool DecodeSingles(const unsigned char* pairs, unsigned char* out) {
+    std::uint16_t others = 0;
+    for (std::size_t k = 0; k < kBlock; ++k) {
+        others |=
+            static_cast<std::uint16_t>(((LoadLane(pairs + 2 * k) >> kCountShift) & 0xFFu) ^ 1u);
+    }
+    if (others != 0) {
+        return false;
+    }
+    for (std::size_t k = 0; k < kBlock; ++k) {
+        out[k] = static_cast<unsigned char>(LoadLane(pairs + 2 * k) >> kValueShift);
+    }
+    return true;
+}
+
 detail::EncodedBytes EncodePairs(const unsigned char* in, std::size_t count, std::size_t& size) {
     detail::ByteSink sink(2 * count);
     unsigned char* out = sink.Reserve(2 * count);
     for (std::size_t i = 0; i < count;) {
+        // Noise: a block of runs of one at once.
+        if (count - i > kBlock && EncodeSingles(in + i, out)) {
+            out += 2 * kBlock;
+            i += kBlock;
+            continue;
+        }
         const unsigned char value = in[i];
         std::size_t end = i + 1;
         if (end < count && in[end] == value) {
@@ -119,14 +172,27 @@ void RLECompressedData::Decode(unsigned char* out) const {
     const unsigned char* pair = m_buffer.get();
     const unsigned char* const end = pair + m_size;
     while (pair != end) {
-        // Pairs of one value split at 255 are joined into one fill.
-        const unsigned char value = pair[1];
-        std::size_t length = pair[0];
-        for (pair += 2; pair != end && pair[1] == value; pair += 2) {
-            length += pair[0];
+        // Noise: a block of pairs of count 1 at once; a block that holds a longer run is
+        // decoded pair by pair before the next block is tried.
+        const unsigned char* blockEnd = end;
+        if (static_cast<std::size_t>(end - pair) >= 2 * kBlock) {
+            if (DecodeSingles(pair, out)) {
+                out += kBlock;
+                pair += 2 * kBlock;
+                continue;
+            }
+            blockEnd = pair + 2 * kBlock;
         }
-        detail::FillBytes(out, value, length);
-        out += length;
+        do {
+            // Pairs of one value split at 255 are joined into one fill.
+            const unsigned char value = pair[1];
+            std::size_t length = pair[0];
+            for (pair += 2; pair != end && pair[1] == value; pair += 2) {
+                length += pair[0];
+            }
+            detail::FillBytes(out, value, length);
+            out += length;
+        } while (pair < blockEnd);
     }
 }
 

@@ -59,6 +59,27 @@ inline std::uint64_t LoadLowFirst(const unsigned char* bytes) {
     return kLittleEndian ? word : ByteSwap(word);
 }
 
+/// Stores `word` at `bytes` with its lowest byte in bytes[0].
+inline void StoreLowFirst(unsigned char* bytes, std::uint64_t word) {
+    const std::uint64_t ordered = kLittleEndian ? word : ByteSwap(word);
+    std::memcpy(bytes, &ordered, sizeof ordered);
+}
+
+/// Flags the high bit of every zero byte of `word`. A borrow can flag a byte above a zero
+/// one as well, never one below: the result is 0 exactly when no byte is zero, and its
+/// lowest flag is exact.
+inline std::uint64_t ZeroBytes(std::uint64_t word) {
+    return (word - kEveryByte) & ~word & (kEveryByte << 7);
+}
+
+/// The sum of the 8 bytes at `bytes`, added pairwise in 16-bit lanes so nothing carries.
+inline std::uint64_t SumOfEightBytes(const unsigned char* bytes) {
+    constexpr std::uint64_t kLowBytes = 0x00FF00FF00FF00FFull;
+    const std::uint64_t word = LoadLowFirst(bytes);
+    const std::uint64_t pairs = (word & kLowBytes) + ((word >> 8) & kLowBytes);
+    return (pairs * 0x0001000100010001ull) >> 48;
+}
+
 /// The 8 bytes at `bytes` with bytes[0] in the highest byte, so that the bit stream read
 /// most significant bit first runs from bit 63 down.
 inline std::uint64_t LoadHighFirst(const unsigned char* bytes) {
@@ -105,10 +126,7 @@ inline std::size_t FindByteChange(const unsigned char* data, std::size_t begin, 
 /// First index in [begin, end) holding a zero byte, or `end`.
 inline std::size_t FindZeroByte(const unsigned char* data, std::size_t begin, std::size_t end) {
     for (; end - begin >= 8; begin += 8) {
-        const std::uint64_t word = LoadLowFirst(data + begin);
-        // Flags the high bit of every zero byte; a borrow can flag a byte above a zero one
-        // as well, never one below, so the lowest flag is exact.
-        const std::uint64_t zeros = (word - kEveryByte) & ~word & (kEveryByte << 7);
+        const std::uint64_t zeros = ZeroBytes(LoadLowFirst(data + begin));
         if (zeros != 0) {
             return begin + LowestSetBit(zeros) / 8;
         }
