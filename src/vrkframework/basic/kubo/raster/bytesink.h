@@ -3,12 +3,14 @@
 #ifndef VRKFRAMEWORK_BASIC_KUBO_RASTER_BYTESINK_H
 #define VRKFRAMEWORK_BASIC_KUBO_RASTER_BYTESINK_H
 
-#include <sys/mman.h>
-
 #include <cstddef>  // std::size_t
-#include <cstdlib>  // std::malloc, std::realloc, std::free
+#include <cstdlib>  // std::aligned_alloc, std::malloc, std::realloc, std::free
 #include <memory>   // std::unique_ptr
 #include <new>      // std::bad_alloc
+
+#if defined(__linux__)
+#include <sys/mman.h>  // madvise
+#endif
 
 namespace kora::kubo::detail {
 
@@ -26,16 +28,11 @@ using EncodedBytes = std::unique_ptr<unsigned char, FreeBytes>;
 class ByteSink {
 public:
     explicit ByteSink(std::size_t capacity) {
-        constexpr std::size_t kHuge = std::size_t{2} << 20;
-        if (capacity >= 4 * kHuge) {
-            capacity = (capacity + kHuge - 1) / kHuge * kHuge;
-            m_begin = m_end = static_cast<unsigned char*>(std::aligned_alloc(kHuge, capacity));
-            if (m_begin == nullptr) throw std::bad_alloc();
-            m_limit = m_begin + capacity;
-            madvise(m_begin, capacity, MADV_HUGEPAGE);
-            return;
+        if (capacity >= kLarge) {
+            AllocateLarge(capacity);
+        } else {
+            Grow(capacity);
         }
-        Grow(capacity);
     }
     ByteSink(const ByteSink&) = delete;
     ByteSink& operator=(const ByteSink&) = delete;
@@ -65,7 +62,28 @@ public:
     }
 
 private:
+    static constexpr std::size_t kHugePage = std::size_t{2} << 20;
+    static constexpr std::size_t kLarge = 4 * kHugePage;
+
     std::size_t Capacity() const { return static_cast<std::size_t>(m_limit - m_begin); }
+
+    // Filling a large fresh block costs more in first-touch page faults than in
+    // encoding; on Linux, huge pages cut those faults several times over. The advice is
+    // a hint: refused or not, the block is valid.
+    void AllocateLarge(std::size_t capacity) {
+#if defined(__linux__)
+        const std::size_t rounded = (capacity + kHugePage - 1) / kHugePage * kHugePage;
+        m_begin = static_cast<unsigned char*>(std::aligned_alloc(kHugePage, rounded));
+        if (m_begin == nullptr) {
+            throw std::bad_alloc();
+        }
+        madvise(m_begin, rounded, MADV_HUGEPAGE);
+        m_end = m_begin;
+        m_limit = m_begin + rounded;
+#else
+        Grow(capacity);
+#endif
+    }
 
     void Grow(std::size_t capacity) {
         const std::size_t size = Size();
