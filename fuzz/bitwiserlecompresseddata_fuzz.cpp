@@ -73,7 +73,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         std::vector<unsigned char> expected = window;
         bool startsInLastRun = false;
         bool beforeTheStream = false;
-        for (long long r = 0; r < rows; ++r) {
+        for (long long r = 0; inside && r < rows; ++r) {
             const long long offset = (y + r) * line + x;
             beforeTheStream = beforeTheStream || offset < 0;
             startsInLastRun = startsInLastRun || 8 * offset > lastRunStart;
