@@ -50,14 +50,14 @@ bool EncodeSingles(const unsigned char* in, unsigned char* out) {
 bool DecodeSingles(const unsigned char* pairs, unsigned char* out) {
     std::uint16_t others = 0;
     for (std::size_t k = 0; k < kBlock; ++k) {
-        others |=
-            static_cast<std::uint16_t>(((LoadLane(pairs + 2 * k) >> kCountShift) & 0xFFu) ^ 1u);
+        const unsigned int lane = LoadLane(pairs + 2 * k);
+        others |= static_cast<std::uint16_t>(((lane >> kCountShift) & 0xFFu) ^ 1u);
     }
     if (others != 0) {
         return false;
     }
     for (std::size_t k = 0; k < kBlock; ++k) {
-        out[k] = static_cast<unsigned char>(LoadLane(pairs + 2 * k) >> kValueShift);
+        out[k] = static_cast<unsigned char>(unsigned{LoadLane(pairs + 2 * k)} >> kValueShift);
     }
     return true;
 }
