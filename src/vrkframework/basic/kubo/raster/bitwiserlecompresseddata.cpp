@@ -8,6 +8,7 @@
 
 #include "vrkframework/basic/kubo/raster/alternatingruns.h"
 #include "vrkframework/basic/kubo/raster/bytesink.h"
+#include "vrkframework/basic/kubo/raster/decodedbytes.h"
 #include "vrkframework/basic/kubo/raster/wordscan.h"
 #include "vrkframework/platform/exception.h"
 
@@ -120,16 +121,13 @@ unsigned long BitwiseRLECompressedData::GetBufferSizeBytes() const {
 }
 
 unsigned char* BitwiseRLECompressedData::Decode() const {
-    auto* out = new unsigned char[GetBufferSizeBytes()];
-    Decode(out);
-    return out;
+    return detail::NewDecoded(GetBufferSizeBytes(), [this](unsigned char* out) { Decode(out); });
 }
 
 unsigned char* BitwiseRLECompressedData::Decode(int x, int y, int w, int h) const {
-    const unsigned long size = GetBufferSizeBytes();
-    std::unique_ptr<unsigned char[]> out(new unsigned char[size]);
-    DecodeWindow(x, y, w, h, out.get(), size);
-    return out.release();
+    const auto size = GetBufferSizeBytes();
+    return detail::NewDecoded(size,
+                              [&](unsigned char* out) { DecodeWindow(x, y, w, h, out, size); });
 }
 
 void BitwiseRLECompressedData::Decode(unsigned char* out) const {

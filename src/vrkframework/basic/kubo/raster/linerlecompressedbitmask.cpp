@@ -10,8 +10,8 @@
 #include <vector>
 
 #include "vrkframework/basic/kubo/raster/alternatingruns.h"
-#include "vrkframework/basic/kubo/raster/bytefill.h"
 #include "vrkframework/basic/kubo/raster/bytesink.h"
+#include "vrkframework/basic/kubo/raster/decodedbytes.h"
 #include "vrkframework/basic/kubo/raster/wordscan.h"
 #include "vrkframework/platform/exception.h"
 
@@ -151,9 +151,7 @@ void LineRLECompressedBitMask::CompressRow(unsigned char* data, unsigned long ro
 }
 
 unsigned char* LineRLECompressedBitMask::DecodeRow(unsigned long row) const {
-    auto* out = new unsigned char[GetRowSize()];
-    DecodeRow(row, out);
-    return out;
+    return detail::NewDecoded(GetRowSize(), [&](unsigned char* out) { DecodeRow(row, out); });
 }
 
 void LineRLECompressedBitMask::DecodeRow(unsigned long row, unsigned char* out) const {
@@ -167,16 +165,13 @@ void LineRLECompressedBitMask::DecodePartialRow(unsigned long row, unsigned long
 }
 
 unsigned char* LineRLECompressedBitMask::Decode() const {
-    auto* out = new unsigned char[GetBufferSize()];
-    Decode(out);
-    return out;
+    return detail::NewDecoded(GetBufferSize(), [this](unsigned char* out) { Decode(out); });
 }
 
 unsigned char* LineRLECompressedBitMask::Decode(int x, int y, int w, int h) const {
-    const unsigned long size = GetBufferSize();
-    std::unique_ptr<unsigned char[]> out(new unsigned char[size]);
-    DecodeWindow(x, y, w, h, out.get(), size);
-    return out.release();
+    const auto size = GetBufferSize();
+    return detail::NewDecoded(size,
+                              [&](unsigned char* out) { DecodeWindow(x, y, w, h, out, size); });
 }
 
 void LineRLECompressedBitMask::Decode(unsigned char* out) const {

@@ -5,8 +5,8 @@
 #include <cstdint>    // std::uint16_t, std::uint32_t, std::uint64_t
 #include <cstring>    // std::memcpy
 
-#include "vrkframework/basic/kubo/raster/bytefill.h"
 #include "vrkframework/basic/kubo/raster/bytesink.h"
+#include "vrkframework/basic/kubo/raster/decodedbytes.h"
 #include "vrkframework/basic/kubo/raster/wordscan.h"
 #include "vrkframework/platform/exception.h"
 
@@ -151,16 +151,13 @@ std::size_t RLECompressedData::GetRasterSize() const {
 }
 
 unsigned char* RLECompressedData::Decode() const {
-    auto* out = new unsigned char[GetRasterSize()];
-    Decode(out);
-    return out;
+    return detail::NewDecoded(GetRasterSize(), [this](unsigned char* out) { Decode(out); });
 }
 
 unsigned char* RLECompressedData::Decode(int x, int y, int w, int h) const {
-    const std::size_t size = GetRasterSize();
-    std::unique_ptr<unsigned char[]> out(new unsigned char[size]);
-    DecodeWindow(x, y, w, h, out.get(), size);
-    return out.release();
+    const auto size = GetRasterSize();
+    return detail::NewDecoded(size,
+                              [&](unsigned char* out) { DecodeWindow(x, y, w, h, out, size); });
 }
 
 void RLECompressedData::Decode(unsigned char* out) const {
