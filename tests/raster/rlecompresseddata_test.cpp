@@ -4,7 +4,6 @@
 
 #include <algorithm>
 #include <array>
-#include <memory>
 #include <numeric>
 #include <random>
 
@@ -81,19 +80,6 @@ TEST(RLECompressedData, DescriptionIncludesTheMarginsAndSamplesRoundUpToBytes) {
         const RLECompressedData pairs = Compress(Bytes(8, 3), RasterInfo(2, 1, 1, type));
         EXPECT_EQ(Pairs(pairs), (Bytes{4, 3}));
     }
-}
-
-TEST(RLECompressedData, InheritedDescriptionStaysZeroUntilACopyTakesItFromItsSource) {
-    RLECompressedData data = Compress8U({1, 2}, 2, 1);
-    EXPECT_EQ(data.width, 0u);
-    EXPECT_EQ(data.height, 0u);
-    EXPECT_EQ(data.channels, 0u);
-    EXPECT_EQ(data.dataType, DataType());
-    data.width = 11;
-    data.dataType = DataType::Type64R;
-    const RLECompressedData copy(data);
-    EXPECT_EQ(copy.width, 11u);
-    EXPECT_EQ(copy.dataType, DataType::Type64R);
 }
 
 TEST(RLECompressedData, AnEmptyRasterGivesAnEmptyStreamAndDecodesNothing) {
@@ -232,25 +218,7 @@ TEST(RLECompressedData, UncheckedWindowsReadNothingPastThePairs) {
     EXPECT_EQ(Window(data, 0, 0, 3, 0), Bytes());
 }
 
-TEST(RLECompressedData, CopiesShareTheirPairsUntilTheLastOneGoes) {
-    auto source = std::make_unique<RLECompressedData>(Compress8U({1, 1, 2}, 3, 1));
-    RLECompressedData copy(*source);
-    RLECompressedData assigned = Compress8U({9}, 1, 1);
-    assigned = *source;
-    EXPECT_EQ(copy.GetCompressedData(), source->GetCompressedData());
-    EXPECT_EQ(assigned.GetCompressedData(), source->GetCompressedData());
-    source.reset();
-    EXPECT_EQ(kubo_test::Take(copy.Decode(), 3), (Bytes{1, 1, 2}));
-    EXPECT_EQ(assigned.GetWidth(), 3u);
-
-    const auto& self = assigned;
-    assigned = self;
-    RLECompressedData moved(std::move(copy));
-    EXPECT_EQ(kubo_test::Take(copy.Decode(), 3), (Bytes{1, 1, 2}));  // NOLINT: still valid
-    EXPECT_EQ(moved.GetCompressedData(), assigned.GetCompressedData());
-}
-
-TEST(RLECompressedData, NullBuffersAreRejected) {
+TEST(RLECompressedData, ANullBufferIsNotCompressed) {
     RasterInfo info(2, 2, 1, DataType::Type8U);
     RasterContext context;
     const auto compress =
@@ -261,21 +229,6 @@ TEST(RLECompressedData, NullBuffersAreRejected) {
                             "char *,class kora::kubo::RasterInfo &,class "
                             "kora::kubo::RasterContext &)",
                             30);
-
-    const RLECompressedData data = Compress8U({1, 2, 3, 4}, 2, 2);
-    const auto whole = kubo_test::Catch<kora::DataException>([&] { data.Decode(nullptr); });
-    ASSERT_TRUE(whole);
-    kubo_test::ExpectReport(
-        *whole, "pBuffer is NULL, cannot Decode in NULL buffer", kSource,
-        "void __cdecl kora::kubo::RLECompressedData::Decode(unsigned char *) const", 107);
-
-    const auto window =
-        kubo_test::Catch<kora::DataException>([&] { data.Decode(0, 0, 1, 1, nullptr); });
-    ASSERT_TRUE(window);
-    kubo_test::ExpectReport(
-        *window, "pBuffer is NULL, cannot Decode in NULL buffer", kSource,
-        "void __cdecl kora::kubo::RLECompressedData::Decode(int,int,int,int,unsigned char *) const",
-        146);
 }
 
 }  // namespace

@@ -33,12 +33,14 @@ void AppendAlternatingRuns(std::uint64_t count, FindRunEnd findRunEnd, ByteSink&
     } while (position < count);
 }
 
-/// Reads runs from `runs[index]` on: returns the length of the next run joined with every
-/// run that a 0 separator continues, and moves `index` past them. The value of the
-/// stretch is that of the run at the first index; a joined pair of runs keeps it.
-inline std::uint64_t NextStretch(const unsigned char* runs, std::size_t count, std::size_t& index) {
+/// Reads runs from `runs[index]` on: returns the length of the next run joined with the
+/// runs that 0 separators continue, as long as the length is below `enough`, and moves
+/// `index` past them. The value of the stretch is that of the run at the first index; a
+/// joined pair of runs keeps it.
+inline std::uint64_t NextStretch(const unsigned char* runs, std::size_t count, std::size_t& index,
+                                 std::uint64_t enough = UINT64_MAX) {
     std::uint64_t length = runs[index++];
-    while (index + 1 < count && runs[index] == 0) {
+    while (length < enough && index + 1 < count && runs[index] == 0) {
         length += runs[index + 1];
         index += 2;
     }

@@ -6,7 +6,7 @@
 #include <climits>    // ULONG_MAX
 #include <cstdint>    // std::uint64_t
 #include <cstring>    // std::memcpy
-#include <utility>    // std::pair
+#include <utility>    // std::move, std::pair
 #include <vector>
 
 #include "vrkframework/basic/kubo/raster/alternatingruns.h"
@@ -34,6 +34,12 @@ void DecodeRuns(const unsigned char* runs, std::size_t runCount, unsigned long s
             sum += detail::SumOfEightBytes(runs + run);
             run += 8;
         }
+        // The start lies within the next eight runs, or past the row.
+        while (sum < start && runCount - run >= 4) {
+            std::uint64_t added = 0;
+            run += detail::AddBytesUntil(runs + run, start - sum, added);
+            sum += added;
+        }
         while (sum < start && run < runCount) {
             sum += runs[run++];
         }
@@ -50,30 +56,48 @@ void DecodeRuns(const unsigned char* runs, std::size_t runCount, unsigned long s
     }
     while (written < count && run < runCount) {
         const bool value = detail::RunValue(run);
-        const auto length = static_cast<unsigned long>(
-            std::min<std::uint64_t>(detail::NextStretch(runs, runCount, run), count - written));
+        const auto length = static_cast<unsigned long>(std::min<std::uint64_t>(
+            detail::NextStretch(runs, runCount, run, count - written), count - written));
         detail::FillBytes(out + written, value, length);
         written += length;
     }
     detail::FillBytes(out + written, 0, count - written);  // past the runs: clear
 }
 
+// Appends the runs of `count` mask bytes (zero clear, anything else set).
+void AppendRowRuns(const unsigned char* data, std::size_t count, detail::ByteSink& sink) {
+    detail::AppendAlternatingRuns(
+        count,
+        [&](std::uint64_t position, bool set) {
+            const auto begin = static_cast<std::size_t>(position);
+            return set ? detail::FindZeroByte(data, begin, count)
+                       : detail::FindByteChange(data, begin, count, 0);
+        },
+        sink);
+}
+
 }  // namespace
 
-/// One run stream per row (null while the row is empty) and its size.
+/// Where each row's runs are (null while the row is empty) and how many there are.
 struct LineRLECompressedBitMask::RowTable {
-    explicit RowTable(unsigned int height) : rows(height), sizes(height, 0u) {}
+    explicit RowTable(unsigned int height)
+        : starts(height, nullptr), sizes(height, 0u), owned(height) {}
 
     /// The runs of `row` and their number: none for a row not stored yet or past the last.
     std::pair<const unsigned char*, std::size_t> Runs(unsigned long row) const {
-        if (row >= rows.size()) {
+        if (row >= starts.size()) {
             return {nullptr, 0};
         }
-        return {rows[row].get(), sizes[row]};
+        return {starts[row], sizes[row]};
     }
 
-    std::vector<std::unique_ptr<unsigned char[]>> rows;
+    std::vector<const unsigned char*> starts;
     std::vector<unsigned int> sizes;
+    /// The rows compressed from a raster, back to back, so that rows decoded one after
+    /// the other share cache lines; a row replaced later just stops pointing here.
+    detail::EncodedBytes block;
+    /// Rows stored by CompressRow, each in a buffer of its own.
+    std::vector<std::unique_ptr<unsigned char[]>> owned;
 };
 
 LineRLECompressedBitMask::LineRLECompressedBitMask(unsigned int maskWidth, unsigned int maskHeight)
@@ -85,10 +109,22 @@ LineRLECompressedBitMask::LineRLECompressedBitMask(Raster& raster)
     // Rasters place a pixel at its bit offset divided by 8.
     const std::uint64_t pixelBits = std::uint64_t{raster.channels} * raster.dataType.bits *
                                     (raster.dataType.isComplex ? 2u : 1u);
+    detail::ByteSink sink(std::size_t{raster.height} * 16 + 16);  // grows for busy masks
+    std::vector<std::size_t> ends(raster.height);
     for (unsigned int row = 0; row < raster.height; ++row) {
         const std::uint64_t pixel =
             (std::uint64_t{raster.yMargin} + row) * raster.lineStride + raster.xMargin;
-        CompressRow(raster.data + pixel * pixelBits / 8, row);
+        AppendRowRuns(raster.data + pixel * pixelBits / 8, GetRowSize(), sink);
+        ends[row] = sink.Size();
+    }
+    // The block has its final address only now.
+    RowTable& table = *m_rows;
+    table.block = sink.Release();
+    std::size_t begin = 0;
+    for (unsigned int row = 0; row < raster.height; ++row) {
+        table.starts[row] = table.block.get() + begin;
+        table.sizes[row] = static_cast<unsigned int>(ends[row] - begin);
+        begin = ends[row];
     }
 }
 
@@ -127,14 +163,7 @@ std::unique_ptr<unsigned char[]> LineRLECompressedBitMask::Compress(unsigned cha
                                                                     unsigned long count,
                                                                     unsigned long& size) {
     detail::ByteSink sink(count + 1);  // the most a row can take
-    detail::AppendAlternatingRuns(
-        count,
-        [&](std::uint64_t position, bool set) {
-            const auto begin = static_cast<std::size_t>(position);
-            return set ? detail::FindZeroByte(data, begin, count)
-                       : detail::FindByteChange(data, begin, count, 0);
-        },
-        sink);
+    AppendRowRuns(data, count, sink);
     size = static_cast<unsigned long>(sink.Size());
     std::unique_ptr<unsigned char[]> runs(new unsigned char[size]);
     std::memcpy(runs.get(), sink.Data(), size);
@@ -146,8 +175,10 @@ void LineRLECompressedBitMask::CompressRow(unsigned char* data, unsigned long ro
         return;
     }
     unsigned long size = 0;
-    m_rows->rows[row] = Compress(data, GetRowSize(), size);
+    std::unique_ptr<unsigned char[]> runs = Compress(data, GetRowSize(), size);
+    m_rows->starts[row] = runs.get();
     m_rows->sizes[row] = static_cast<unsigned int>(size);
+    m_rows->owned[row] = std::move(runs);  // releases the buffer the row had, if any
 }
 
 unsigned char* LineRLECompressedBitMask::DecodeRow(unsigned long row) const {
