@@ -22,6 +22,16 @@ constexpr std::size_t kBlock = 32;
 constexpr unsigned int kCountShift = detail::kLittleEndian ? 0 : 8;
 constexpr unsigned int kValueShift = 8 - kCountShift;
 
+constexpr std::uint64_t kCountBytes = 0x00FF00FF00FF00FFull;
+constexpr std::uint64_t kCountsOfOne = 0x0001000100010001ull;
+
+// The values of the four pairs in `pairs` (loaded lowest byte first), in the low bytes.
+std::uint32_t ValuesOfFour(std::uint64_t pairs) {
+    std::uint64_t values = (pairs >> 8) & kCountBytes;
+    values = (values | (values >> 8)) & 0x0000FFFF0000FFFFull;
+    return static_cast<std::uint32_t>(values | (values >> 16));
+}
+
 std::uint16_t LoadLane(const unsigned char* bytes) {
     std::uint16_t lane;
     std::memcpy(&lane, bytes, sizeof lane);
@@ -181,6 +191,19 @@ void RLECompressedData::Decode(unsigned char* out) const {
             blockEnd = pair + 2 * kBlock;
         }
         do {
+            // Inside such a block, the pairs of count 1 before the longer run go four at a
+            // time; writing all four values is safe, as four more pairs are left.
+            if (end - pair >= 8) {
+                const std::uint64_t four = detail::LoadLowFirst(pair);
+                const std::uint64_t others = (four & kCountBytes) ^ kCountsOfOne;
+                detail::StoreLowFirst4(out, ValuesOfFour(four));
+                const unsigned int singles = others == 0 ? 4 : detail::LowestSetBit(others) / 16;
+                out += singles;
+                pair += 2 * singles;
+                if (singles == 4) {
+                    continue;
+                }
+            }
             // Pairs of one value split at 255 are joined into one fill.
             const unsigned char value = pair[1];
             std::size_t length = pair[0];

@@ -65,6 +65,13 @@ inline void StoreLowFirst(unsigned char* bytes, std::uint64_t word) {
     std::memcpy(bytes, &ordered, sizeof ordered);
 }
 
+/// Stores the 4 bytes of `word` at `bytes`, lowest byte first.
+inline void StoreLowFirst4(unsigned char* bytes, std::uint32_t word) {
+    const auto ordered =
+        kLittleEndian ? word : static_cast<std::uint32_t>(ByteSwap(std::uint64_t{word}) >> 32);
+    std::memcpy(bytes, &ordered, sizeof ordered);
+}
+
 /// Flags the high bit of every zero byte of `word`. A borrow can flag a byte above a zero
 /// one as well, never one below: the result is 0 exactly when no byte is zero, and its
 /// lowest flag is exact.
