@@ -34,6 +34,9 @@ void Interpret(benchmark::State& state, DataType type) {
         benchmark::ClobberMemory();
     }
     state.SetItemsProcessed(static_cast<std::int64_t>(state.iterations()) * kSide * kSide);
+    state.counters["s/pixel"] =
+        benchmark::Counter(double{kSide} * kSide, benchmark::Counter::kIsIterationInvariantRate |
+                                                      benchmark::Counter::kInvert);
     kubo_bench::CompareWithMemcpy(state, in.byteSize);
 }
 

@@ -240,6 +240,14 @@ TEST(ComplexInterpretation, DispatcherFailureKeepsThePreviousWorkerUsable) {
     EXPECT_EQ(Floats(out)[0], 2.0f);
 }
 
+TEST(ComplexInterpretation, WorkersLeaveNullRastersAlone) {
+    const ComplexInterpretation::InnerProcessor<float> worker;
+    Raster out = MakeRaster(DataType::Type32R, std::vector<float>{-5});
+    worker.InterpretRaster(nullptr, &out, INTERPRETATION_REAL);
+    EXPECT_EQ(Floats(out)[0], -5.0f);
+    EXPECT_EQ(worker.InterpretRaster(nullptr, INTERPRETATION_REAL), nullptr);
+}
+
 TEST(ComplexInterpretation, UnknownInterpretationCodeFailsWithoutLeaking) {
     const Raster c32r = MakeRaster(DataType::TypeC32R, std::vector<float>{1, 2});
     const auto unknown = static_cast<KORAInterpretationTypes>(7);

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <cstring>
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -98,6 +99,8 @@ struct Format {
     unsigned int channels;
     const char* name;
 };
+// Names the parameter in test reports (the default would print its padding bytes).
+void PrintTo(const Format& format, std::ostream* out) { *out << format.name; }
 
 class FillRasterMarginsFormats : public ::testing::TestWithParam<Format> {};
 

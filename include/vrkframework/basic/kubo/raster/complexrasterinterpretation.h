@@ -23,9 +23,10 @@ class KUBO_API ComplexInterpretation : public IRasterInterpretation {
 public:
     /// The worker for one component type T of the dispatch list: reads each component as T
     /// (sign extension for signed integers, zero extension for unsigned ones, widening for
-    /// float) and converts it to double. It checks nothing; ComplexInterpretation does.
-    /// Reads and writes stay within the buffers the rasters own; for a wrapped buffer the
-    /// caller guarantees its extent.
+    /// float) and converts it to double. It raises nothing of its own (a null raster is left
+    /// alone, and the new-raster overload returns null for it); ComplexInterpretation
+    /// checks. Reads and writes stay within the buffers the rasters own; for a wrapped
+    /// buffer the caller guarantees its extent.
     template <class T>
     class InnerProcessor;
 

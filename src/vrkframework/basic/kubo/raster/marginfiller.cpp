@@ -119,10 +119,10 @@ Point WrapSource(Band band, const Layout& layout, Index x, Index y) {
     return {column, y - layout.height};
 }
 
-// Pixel by pixel in the documented loop order (left and top: x outer, right and bottom:
-// y outer), for what the line rules cannot express: packed samples, whose pixel starts are
-// no multiples of the pixel size, and margins wider than the image, where a band may read
-// pixels it has just written and the side bands read each other.
+// Pixel by pixel in the loop order that settles the order-dependent reads (left and top:
+// x outer, right and bottom: y outer), for what the line rules cannot express: packed samples,
+// whose pixel starts are no multiples of the pixel size, and margins wider than the image, where a
+// band may read pixels it has just written and the side bands read each other.
 void FillBandPerPixel(const Layout& layout, Band band, eMarginBehaviour behaviour) {
     const auto pixelBytes = static_cast<std::size_t>(layout.pixelBytes);
     auto fill = [&](Index x, Index y) {
