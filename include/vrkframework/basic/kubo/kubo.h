@@ -2,7 +2,17 @@
 #ifndef VRKFRAMEWORK_BASIC_KUBO_KUBO_H
 #define VRKFRAMEWORK_BASIC_KUBO_KUBO_H
 
+#include "vrkframework/basic/kubo/controlpoints/controlpoint.h"
+#include "vrkframework/basic/kubo/controlpoints/controlpointcontainer.h"
+#include "vrkframework/basic/kubo/controlpoints/groundlocation.h"
+#include "vrkframework/basic/kubo/controlpoints/groundlocationpolicy.h"
+#include "vrkframework/basic/kubo/controlpoints/historyevent.h"
+#include "vrkframework/basic/kubo/controlpoints/imagelocation.h"
+#include "vrkframework/basic/kubo/controlpoints/imagelocationpolicy.h"
+#include "vrkframework/basic/kubo/controlpoints/location.h"
 #include "vrkframework/basic/kubo/kuboapi.h"
+#include "vrkframework/basic/kubo/luts/lut.h"
+#include "vrkframework/basic/kubo/luts/pct.h"
 #include "vrkframework/basic/kubo/raster/datatype.h"
 #include "vrkframework/basic/kubo/raster/datatypeconstraints.h"
 #include "vrkframework/basic/kubo/raster/nativedatatype.h"

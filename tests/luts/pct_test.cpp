@@ -1,0 +1,140 @@
+#include "vrkframework/basic/kubo/luts/pct.h"
+
+#include <gtest/gtest.h>
+
+#include <limits>
+#include <tuple>
+#include <vector>
+
+#include "support/expectfailure.h"
+
+namespace {
+
+using kora::kubo::PCT;
+using Colour = PCT::Colour;
+using Entries = std::vector<PCT::Entry>;
+
+constexpr char kSource[] = "vrkframework/basic/kubo/luts/pct";
+
+auto Components(const Colour& colour) { return std::make_tuple(colour.r, colour.g, colour.b); }
+auto Components(int r, int g, int b) {
+    return std::make_tuple(static_cast<unsigned char>(r), static_cast<unsigned char>(g),
+                           static_cast<unsigned char>(b));
+}
+
+TEST(PCT, InterpolatesEachComponentTruncatedAndClampsOutside) {
+    const PCT pct(Entries{{0, {0, 0, 0}}, {10, {255, 100, 7}}});
+    EXPECT_EQ(Components(pct.GetValue(5)), Components(127, 50, 3));
+    EXPECT_EQ(Components(pct.GetValue(9.99)), Components(254, 99, 6));
+    EXPECT_EQ(Components(pct.GetValue(-1)), Components(0, 0, 0));
+    EXPECT_EQ(Components(pct.GetValue(11)), Components(255, 100, 7));
+    EXPECT_EQ(Components(pct.GetValue(10)), Components(255, 100, 7));
+    EXPECT_EQ(Components(pct.GetValue(std::numeric_limits<double>::quiet_NaN())),
+              Components(0, 0, 0));
+}
+
+TEST(PCT, FallingComponentsUseASignedDifference) {
+    const PCT pct(Entries{{0, {200, 0, 9}}, {10, {100, 0, 0}}});
+    EXPECT_EQ(Components(pct.GetValue(5)), Components(150, 0, 4));  // 4.5 truncates to 4
+    EXPECT_EQ(Components(pct.GetValue(9.99)), Components(100, 0, 0));
+}
+
+TEST(PCT, FollowsTheLookupRulesForEqualInputsAndOrder) {
+    const PCT direct(Entries{{1, {1, 1, 1}}, {1, {2, 2, 2}}, {2, {4, 4, 4}}});
+    EXPECT_EQ(Components(direct.GetValue(1)), Components(2, 2, 2));
+    const PCT searched(
+        Entries{{-1, {0, 0, 0}}, {0.5, {1, 1, 1}}, {0.5, {3, 3, 3}}, {2, {9, 9, 9}}});
+    EXPECT_EQ(Components(searched.GetValue(0.5)), Components(1, 1, 1));
+    const Entries sorted = PCT(Entries{{5, {1, 2, 3}}, {0, {4, 5, 6}}}).GetEntries();
+    ASSERT_EQ(sorted.size(), 2u);
+    EXPECT_EQ(sorted[0].first, 0);
+    EXPECT_EQ(Components(sorted[0].second), Components(4, 5, 6));
+}
+
+TEST(PCT, InfiniteBreakpointsGiveADefinedColour) {
+    // t is inf / inf = NaN, which truncates to the out-of-range value 0 in every component.
+    const double inf = std::numeric_limits<double>::infinity();
+    const PCT pct(Entries{{-inf, {10, 20, 30}}, {0, {40, 50, 60}}});
+    EXPECT_EQ(Components(pct.GetValue(-5)), Components(0, 0, 0));
+    EXPECT_EQ(Components(pct.GetValue(-inf)), Components(10, 20, 30));
+}
+
+TEST(PCT, ClassicTablesFromColoursOrPlanes) {
+    std::vector<unsigned char> planes(768);
+    std::vector<Colour> colours(256);
+    for (unsigned int i = 0; i < 768; ++i) {
+        planes[i] = static_cast<unsigned char>(i * 7 % 251);
+    }
+    for (unsigned int i = 0; i < 256; ++i) {
+        colours[i] = {planes[i], planes[256 + i], planes[512 + i]};
+    }
+    const PCT fromPlanes(planes.data());
+    const PCT fromColours(colours);
+    ASSERT_EQ(fromPlanes.GetEntryCount(), 256u);
+    EXPECT_EQ(Components(fromPlanes.GetValueByIndex(3)),
+              Components(planes[3], planes[259], planes[515]));
+    for (unsigned int i = 0; i < 256; ++i) {
+        EXPECT_EQ(fromColours.GetEntries()[i].first, i);
+        EXPECT_EQ(Components(fromColours.GetValue(i)), Components(fromPlanes.GetValue(i))) << i;
+    }
+    EXPECT_TRUE(IsClassicPCT(fromPlanes));
+    double min = 1;
+    double max = 0;
+    fromPlanes.GetInputValueRange(min, max);
+    EXPECT_EQ(min, 0);
+    EXPECT_EQ(max, 255);
+}
+
+TEST(PCT, ClassicNeeds256InputsFrom0To255WhateverTheColours) {
+    Entries entries;
+    for (int i = 0; i < 256; ++i) {
+        entries.push_back({i + 1.0, {255, 0, 0}});
+    }
+    EXPECT_FALSE(IsClassicPCT(PCT(entries)));
+    for (auto& entry : entries) {
+        entry.first -= 1;
+    }
+    EXPECT_TRUE(IsClassicPCT(PCT(entries)));
+    entries.pop_back();
+    EXPECT_FALSE(IsClassicPCT(PCT(entries)));
+}
+
+TEST(PCT, ReportsEntriesAndClampsIndexPastTheEnd) {
+    const PCT pct(Entries{{1, {1, 2, 3}}, {4, {4, 5, 6}}});
+    Entries out;
+    pct.GetEntries(out);
+    ASSERT_EQ(out.size(), 2u);
+    EXPECT_EQ(out[1].first, 4);
+    EXPECT_EQ(Components(pct.GetValueByIndex(0)), Components(1, 2, 3));
+    EXPECT_EQ(Components(pct.GetValueByIndex(7)), Components(4, 5, 6));
+}
+
+TEST(PCT, ThrowsWhenColourVectorHasNot256Entries) {
+    const auto failure =
+        kubo_test::Catch<kora::DataException>([] { PCT(std::vector<Colour>(10)); });
+    ASSERT_TRUE(failure);
+    kubo_test::ExpectReport(*failure, "PCT must have 256 entries, 10 given.", kSource,
+                            "__cdecl kora::kubo::PCT::PCT(const class std::vector<struct "
+                            "kora::kubo::RGBTuple<unsigned char>,class std::allocator<struct "
+                            "kora::kubo::RGBTuple<unsigned char> > > &)",
+                            54);
+}
+
+TEST(PCT, ThrowsWhenGivenFewerThanTwoEntries) {
+    const auto failure = kubo_test::Catch<kora::ParameterException>([] {
+        PCT(Entries{{0, {1, 2, 3}}});
+    });
+    ASSERT_TRUE(failure);
+    EXPECT_EQ(failure->GetParameterName(), "PCT");
+    EXPECT_EQ(static_cast<int>(failure->GetType()), 8);
+    EXPECT_EQ(failure->GetReceived(), "A 1 PCT entries");
+    EXPECT_EQ(failure->GetExpected(), "At least 2 PCT entries");
+    kubo_test::ExpectReport(
+        *failure, "desc", kSource,
+        "__cdecl kora::kubo::PCT::PCT(const class std::vector<struct std::pair<double,struct "
+        "kora::kubo::RGBTuple<unsigned char> >,class std::allocator<struct "
+        "std::pair<double,struct kora::kubo::RGBTuple<unsigned char> > > > &)",
+        80);
+}
+
+}  // namespace
