@@ -52,10 +52,10 @@ TEST(PCT, FollowsTheLookupRulesForEqualInputsAndOrder) {
 }
 
 TEST(PCT, InfiniteBreakpointsGiveADefinedColour) {
-    // t is inf / inf = NaN, which truncates to the out-of-range value 0 in every component.
+    // Between -inf and 0 the position is inf / inf = NaN: the lower colour answers.
     const double inf = std::numeric_limits<double>::infinity();
     const PCT pct(Entries{{-inf, {10, 20, 30}}, {0, {40, 50, 60}}});
-    EXPECT_EQ(Components(pct.GetValue(-5)), Components(0, 0, 0));
+    EXPECT_EQ(Components(pct.GetValue(-5)), Components(10, 20, 30));
     EXPECT_EQ(Components(pct.GetValue(-inf)), Components(10, 20, 30));
 }
 

@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "vrkframework/basic/kubo/kuboapi.h"
+#include "vrkframework/basic/kubo/luts/directindex.h"
 
 namespace kora::kubo {
 
@@ -45,13 +46,21 @@ public:
     /// answers directly; otherwise the first breakpoint not below `x` is searched: none
     /// gives the last output, the first breakpoint (also for NaN) or an equal input gives
     /// that output, anything else interpolates with the breakpoint before it.
-    double GetValue(double x) const;
+    double GetValue(double x) const {
+        // Inline so that a classic table answers without a call; the search is not.
+        if (const Entry* direct = detail::FindDirect(m_entries, x)) {
+            return direct->second;
+        }
+        return GetSearchedValue(x);
+    }
 
     /// Output of breakpoint `i`. An index past the end is not checked against; it reads
     /// the last breakpoint rather than memory outside the table.
     double GetValueByIndex(unsigned long long i) const;
 
 private:
+    double GetSearchedValue(double x) const;
+
     std::vector<Entry> m_entries;
 };
 

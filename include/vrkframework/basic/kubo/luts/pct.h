@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "vrkframework/basic/kubo/kuboapi.h"
+#include "vrkframework/basic/kubo/luts/directindex.h"
 
 namespace kora::kubo {
 
@@ -56,13 +57,21 @@ public:
     /// The colour for `x`, found as `LUT::GetValue` finds an output; between breakpoints
     /// each component is (upper - lower) x t + lower, with t the position of `x` between
     /// their inputs, truncated toward zero.
-    Colour GetValue(double x) const;
+    Colour GetValue(double x) const {
+        // Inline so that a classic table answers without a call; the search is not.
+        if (const Entry* direct = detail::FindDirect(m_entries, x)) {
+            return direct->second;
+        }
+        return GetSearchedValue(x);
+    }
 
     /// Colour of breakpoint `i`. An index past the end is not checked against; it reads
     /// the last breakpoint rather than memory outside the table.
     Colour GetValueByIndex(unsigned long long i) const;
 
 private:
+    Colour GetSearchedValue(double x) const;
+
     std::vector<Entry> m_entries;
 };
 

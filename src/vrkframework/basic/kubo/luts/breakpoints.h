@@ -1,31 +1,17 @@
-// Breakpoint rules shared by the lookup and pseudocolour tables: their order, the search
-// for an input and the truncating conversions.
+// Breakpoint rules shared by the lookup and pseudocolour tables: their order and the search
+// for an input that has no breakpoint of its own.
 #ifndef VRKFRAMEWORK_BASIC_KUBO_LUTS_BREAKPOINTS_H
 #define VRKFRAMEWORK_BASIC_KUBO_LUTS_BREAKPOINTS_H
 
 #include <algorithm>  // std::is_sorted, std::sort
 #include <cmath>      // std::isnan
 #include <cstddef>    // std::size_t
-#include <cstdint>    // std::int64_t, std::uint32_t
-#include <limits>
 #include <vector>
 
 namespace kora::kubo::detail {
 
 /// Breakpoints of a classic 8-bit table, whose inputs are 0 to 255.
 constexpr std::size_t kClassicEntryCount = 256;
-
-/// Truncates toward zero as the processor's conversion does: NaN and values outside the
-/// range of `Int` give the lowest `Int` instead of undefined behaviour.
-template <class Int>
-constexpr Int Truncate(double value) {
-    // lowest - 1 and -lowest are exact for int. For 64 bits lowest - 1 rounds to lowest,
-    // which only excludes -2^63 itself, and that converts to the lowest value anyway.
-    constexpr double kBelow = static_cast<double>(std::numeric_limits<Int>::min()) - 1.0;
-    constexpr double kAbove = -static_cast<double>(std::numeric_limits<Int>::min());
-    return value > kBelow && value < kAbove ? static_cast<Int>(value)
-                                            : std::numeric_limits<Int>::min();
-}
 
 /// Sorts (input, value) entries by input unless no neighbour pair is out of order.
 template <class Entry>
@@ -77,18 +63,12 @@ struct Bracket {
     bool between;
 };
 
-/// Places `x` among sorted entries (at least 1): direct index, lower bound, clamping at
-/// both ends, exact match, otherwise between `index - 1` and `index`.
+/// Places `x` among sorted entries (at least 1) once the direct index has missed: past the
+/// last input the last entry answers, at or below the first (or NaN) the first, an equal
+/// input its first entry; otherwise `x` lies between `index - 1` and `index`.
 template <class Entry>
-Bracket Locate(const std::vector<Entry>& entries, double x) {
+Bracket Search(const std::vector<Entry>& entries, double x) {
     const std::size_t count = entries.size();
-    // A whole input that names its own breakpoint (any input of a classic table) needs no
-    // search. The index is the low 32 bits of the 64-bit truncation: with equal inputs that
-    // decides which of them answers, so it is kept exactly.
-    const std::size_t direct = static_cast<std::uint32_t>(Truncate<std::int64_t>(x));
-    if (direct < count && entries[direct].first == x) {
-        return {direct, false};
-    }
     const std::size_t upper = LowerBound(entries.data(), count, x);
     if (upper == count) {
         return {count - 1, false};

@@ -2,7 +2,6 @@
 #include "vrkframework/basic/kubo/luts/lut.h"
 
 #include <algorithm>  // std::all_of, std::min
-#include <cstdint>    // std::int64_t
 
 #include "vrkframework/basic/kubo/luts/breakpoints.h"
 #include "vrkframework/platform/exception.h"
@@ -23,8 +22,8 @@ std::vector<LUT::Entry> ClassicEntries(const unsigned char* values) {
 
 // A whole output from 0 to 255 survives truncation to a byte and back unchanged.
 bool IsByteValue(double output) {
-    return static_cast<double>(
-               static_cast<unsigned char>(detail::Truncate<std::int64_t>(output))) == output;
+    return static_cast<double>(static_cast<unsigned char>(detail::TruncateToInt64(output))) ==
+           output;
 }
 
 }  // namespace
@@ -58,8 +57,8 @@ LUT::LUT(const std::vector<Entry>& entries) : m_entries(entries) {
 
 LUT::LUT(const unsigned char* values) : m_entries(ClassicEntries(values)) {}
 
-double LUT::GetValue(double x) const {
-    const detail::Bracket at = detail::Locate(m_entries, x);
+double LUT::GetSearchedValue(double x) const {
+    const detail::Bracket at = detail::Search(m_entries, x);
     const Entry& upper = m_entries[at.index];
     if (!at.between) {
         return upper.second;

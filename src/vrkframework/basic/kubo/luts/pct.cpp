@@ -29,13 +29,11 @@ std::vector<PCT::Colour> InterleavePlanes(const unsigned char* planes) {
     return colours;
 }
 
-// The signed difference keeps a falling component right. Between two ordered breakpoints
-// the result stays within the two components; only tables with infinite or NaN inputs
-// leave that range, and those get the truncation's out-of-range value.
+// The signed difference keeps a falling component right. With t in [0, 1] the result lies
+// between the two components, so truncating it to an int is always defined.
 unsigned char Blend(unsigned char lower, unsigned char upper, double t) {
     const int difference = upper - lower;
-    return static_cast<unsigned char>(
-        detail::Truncate<int>(static_cast<double>(difference) * t + lower));
+    return static_cast<unsigned char>(static_cast<int>(difference * t + lower));
 }
 
 }  // namespace
@@ -70,14 +68,18 @@ PCT::PCT(const std::vector<Entry>& entries) : m_entries(entries) {
 PCT::PCT(const unsigned char* planes)
     : m_entries(ClassicEntries(InterleavePlanes(planes).data())) {}
 
-PCT::Colour PCT::GetValue(double x) const {
-    const detail::Bracket at = detail::Locate(m_entries, x);
+PCT::Colour PCT::GetSearchedValue(double x) const {
+    const detail::Bracket at = detail::Search(m_entries, x);
     const Entry& upper = m_entries[at.index];
     if (!at.between) {
         return upper.second;
     }
     const Entry& lower = m_entries[at.index - 1];
-    const double t = (x - lower.first) / (upper.first - lower.first);
+    const double position = (x - lower.first) / (upper.first - lower.first);
+    // Sorted finite inputs give a position in [0, 1]. Infinite inputs can give NaN (inf / inf)
+    // and inputs left unsorted by NaN anything at all: those count as the lower breakpoint
+    // or, past 1, the upper one, rather than overflowing the conversion.
+    const double t = position >= 0.0 ? std::min(position, 1.0) : 0.0;
     return {Blend(lower.second.r, upper.second.r, t), Blend(lower.second.g, upper.second.g, t),
             Blend(lower.second.b, upper.second.b, t)};
 }
