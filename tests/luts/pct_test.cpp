@@ -52,10 +52,10 @@ TEST(PCT, FollowsTheLookupRulesForEqualInputsAndOrder) {
 }
 
 TEST(PCT, InfiniteBreakpointsGiveADefinedColour) {
-    // Between -inf and 0 the position is inf / inf = NaN: the lower colour answers.
+    // Between -inf and 0 the position is inf / inf = NaN: the upper colour answers.
     const double inf = std::numeric_limits<double>::infinity();
     const PCT pct(Entries{{-inf, {10, 20, 30}}, {0, {40, 50, 60}}});
-    EXPECT_EQ(Components(pct.GetValue(-5)), Components(10, 20, 30));
+    EXPECT_EQ(Components(pct.GetValue(-5)), Components(40, 50, 60));
     EXPECT_EQ(Components(pct.GetValue(-inf)), Components(10, 20, 30));
 }
 

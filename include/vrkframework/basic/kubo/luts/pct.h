@@ -2,6 +2,7 @@
 #ifndef VRKFRAMEWORK_BASIC_KUBO_LUTS_PCT_H
 #define VRKFRAMEWORK_BASIC_KUBO_LUTS_PCT_H
 
+#include <cstdint>  // std::uint32_t
 #include <utility>  // std::pair
 #include <vector>
 
@@ -62,7 +63,9 @@ public:
         if (const Entry* direct = detail::FindDirect(m_entries, x)) {
             return direct->second;
         }
-        return GetSearchedValue(x);
+        const std::uint32_t packed = GetSearchedColour(x);
+        return {static_cast<unsigned char>(packed), static_cast<unsigned char>(packed >> 8),
+                static_cast<unsigned char>(packed >> 16)};
     }
 
     /// Colour of breakpoint `i`. An index past the end is not checked against; it reads
@@ -70,7 +73,8 @@ public:
     Colour GetValueByIndex(unsigned long long i) const;
 
 private:
-    Colour GetSearchedValue(double x) const;
+    // The colour comes back as red | green << 8 | blue << 16, which travels in a register.
+    std::uint32_t GetSearchedColour(double x) const;
 
     std::vector<Entry> m_entries;
 };
