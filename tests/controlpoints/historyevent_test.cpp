@@ -10,22 +10,18 @@ namespace {
 
 using kora::kubo::HistoryEvent;
 
-TEST(HistoryEvent, TakesIdTimestampAndMessageInThatOrder) {
+TEST(HistoryEvent, KeepsIdTimestampAndMessageCutTo16And64Characters) {
     const HistoryEvent event(4, "2024-01-02 03:04", "Point added");
     EXPECT_EQ(event.GetId(), 4u);
     EXPECT_EQ(event.GetTimestamp(), "2024-01-02 03:04");
     EXPECT_EQ(event.GetMessage(), "Point added");
-}
 
-TEST(HistoryEvent, CutsMessagesTo64AndTimestampsTo16Characters) {
     const std::string message(100, 'm');
-    HistoryEvent event(1, "2024-01-02 03:04:05.6", message);
-    EXPECT_EQ(event.GetMessage(), message.substr(0, 64));
-    EXPECT_EQ(event.GetTimestamp(), "2024-01-02 03:04");
-    event.SetMessage(std::string(65, 'x'));
-    EXPECT_EQ(event.GetMessage(), std::string(64, 'x'));
-    event.SetMessage("short");
-    EXPECT_EQ(event.GetMessage(), "short");
+    HistoryEvent cut(1, "2024-01-02 03:04:05.6", message);
+    EXPECT_EQ(cut.GetMessage(), message.substr(0, 64));
+    EXPECT_EQ(cut.GetTimestamp(), "2024-01-02 03:04");
+    cut.SetMessage(std::string(65, 'x'));
+    EXPECT_EQ(cut.GetMessage(), std::string(64, 'x'));
 }
 
 TEST(HistoryEvent, StampsWithTheFrameworkClockInFormat13) {
@@ -36,17 +32,14 @@ TEST(HistoryEvent, StampsWithTheFrameworkClockInFormat13) {
     IMPTime(after, 13);
     EXPECT_TRUE(event.GetTimestamp() == before || event.GetTimestamp() == after)
         << event.GetTimestamp();
-    EXPECT_EQ(event.GetTimestamp().size(), 16u);
     EXPECT_EQ(event.GetMessage(), std::string(64, 'a'));
     EXPECT_EQ(event.GetId(), 2u);
 }
 
-TEST(HistoryEvent, EqualityIgnoresCaseIdAndTimestamp) {
+TEST(HistoryEvent, EqualityComparesMessagesIgnoringCase) {
     const HistoryEvent a(1, "2020-01-01 00:00", "Point added");
-    const HistoryEvent b(2, "2021-06-06 12:00", "POINT ADDED");
-    EXPECT_EQ(a, b);
+    EXPECT_EQ(a, HistoryEvent(2, "2021-06-06 12:00", "POINT ADDED"));
     EXPECT_NE(a, HistoryEvent(1, "2020-01-01 00:00", "Point added!"));
-    EXPECT_NE(a, HistoryEvent(1, "2020-01-01 00:00", "Point"));
     EXPECT_NE(a, HistoryEvent(1, "2020-01-01 00:00", "Point_added"));
 }
 

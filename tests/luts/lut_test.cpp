@@ -4,6 +4,7 @@
 
 #include <cmath>
 #include <limits>
+#include <string>
 #include <vector>
 
 #include "support/expectfailure.h"
@@ -27,22 +28,14 @@ std::vector<unsigned char> Bytes() {
 
 TEST(LUT, InterpolatesBetweenAndClampsOutsideTheBreakpoints) {
     const LUT lut(Entries{{0, 0}, {10, 100}});
-    EXPECT_EQ(lut.GetValue(5), 50);
-    EXPECT_EQ(lut.GetValue(2.5), 25);
-    EXPECT_EQ(lut.GetValue(-3), 0);
-    EXPECT_EQ(lut.GetValue(12), 100);
-    EXPECT_EQ(lut.GetValue(10), 100);
-    EXPECT_EQ(lut.GetValue(kInf), 100);
-    EXPECT_EQ(lut.GetValue(-kInf), 0);
-    EXPECT_EQ(lut.GetValue(1e300), 100);  // far outside the 64-bit range: no direct index
-    EXPECT_EQ(lut.GetValue(kNaN), 0);
-}
-
-TEST(LUT, InterpolatesWithTheFormulaInItsOrderOfOperations) {
-    const LUT lut(Entries{{0.1, 1.0 / 3}, {0.7, 2.9}, {5, -4}});
-    const double x = 0.3;
-    EXPECT_EQ(lut.GetValue(x), (x - 0.1) / (0.7 - 0.1) * (2.9 - 1.0 / 3) + 1.0 / 3);
-    EXPECT_EQ(lut.GetValue(4.0), (4.0 - 0.7) / (5 - 0.7) * (-4 - 2.9) + 2.9);
+    // 1e300 lies outside the 64-bit range, so it has no direct index.
+    const double cases[][2] = {{5, 50},     {2.5, 25},  {-3, 0},      {12, 100}, {10, 100},
+                               {kInf, 100}, {-kInf, 0}, {1e300, 100}, {kNaN, 0}};
+    for (const auto& c : cases) {
+        EXPECT_EQ(lut.GetValue(c[0]), c[1]) << c[0];
+    }
+    const LUT uneven(Entries{{0.1, 1.0 / 3}, {0.7, 2.9}, {5, -4}});
+    EXPECT_EQ(uneven.GetValue(0.3), (0.3 - 0.1) / (0.7 - 0.1) * (2.9 - 1.0 / 3) + 1.0 / 3);
 }
 
 TEST(LUT, ByteTablesMapWholeInputsDirectlyAndInterpolateBetween) {
@@ -56,79 +49,59 @@ TEST(LUT, ByteTablesMapWholeInputsDirectlyAndInterpolateBetween) {
         EXPECT_EQ(fromPointer.GetValue(i), bytes[i]) << i;
     }
     EXPECT_EQ(fromPointer.GetValue(7.5), 0.5 * (bytes[8] - bytes[7]) + bytes[7]);
-    EXPECT_EQ(fromPointer.GetValue(-0.5), bytes[0]);
-    EXPECT_EQ(fromPointer.GetValue(300), bytes[255]);
 }
 
 TEST(LUT, EqualInputsAnswerWithTheDirectIndexElseTheFirstOfThem) {
-    // x = 1 truncates to index 1, whose input is 1: that entry answers, not the first 1.
+    // 1 truncates to index 1, whose input is 1: that entry answers, not the first 1.
     const LUT direct(Entries{{1, 5}, {1, 7}, {2, 9}});
     EXPECT_EQ(direct.GetValue(1), 7);
     EXPECT_EQ(direct.GetValue(1.5), 8);
-    // x = 0.5 indexes entry 0 (input -1), so the search answers with the first 0.5.
+    // 0.5 indexes entry 0 (input -1), so the search answers with the first 0.5.
     const LUT searched(Entries{{-1, 0}, {0.5, 1}, {0.5, 3}, {2, 5}});
     EXPECT_EQ(searched.GetValue(0.5), 1);
     EXPECT_EQ(searched.GetValue(1), (1 - 0.5) / (2 - 0.5) * (5 - 3) + 3);
+    // 2^32 + 1 keeps the low 32 bits of its truncation: index 1.
+    const double big = 4294967297.0;
+    EXPECT_EQ(LUT(Entries{{big, 10}, {big, 20}, {big, 30}}).GetValue(big), 20);
 }
 
-TEST(LUT, DirectIndexIsTheLow32BitsOfTheTruncation) {
-    const double big = 4294967297.0;  // 2^32 + 1: its index is 1
-    const LUT lut(Entries{{big, 10}, {big, 20}, {big, 30}});
-    EXPECT_EQ(lut.GetValue(big), 20);
-}
-
-TEST(LUT, SortsOnlyWhenANeighbourPairIsOutOfOrder) {
+TEST(LUT, SortsOnlyWhenANeighbourPairIsOutOfOrderNaNLast) {
     EXPECT_EQ(LUT(Entries{{5, 1}, {0, 0}}).GetEntries(), (Entries{{0, 0}, {5, 1}}));
-    EXPECT_EQ(LUT(Entries{{3, 0}, {1, 1}, {2, 2}}).GetEntries(), (Entries{{1, 1}, {2, 2}, {3, 0}}));
-    // Already in order: kept as given, which an (unstable) sort of 40 equal inputs would not.
+    // In order already: kept as given, which an (unstable) sort of 40 equal inputs is not.
     Entries equal;
     for (int i = 0; i < 40; ++i) {
         equal.emplace_back(1, i);
     }
     EXPECT_EQ(LUT(equal).GetEntries(), equal);
-}
 
-TEST(LUT, SortPlacesNaNInputsAfterEveryNumber) {
-    Entries entries;
+    Entries mixed;
     for (int i = 0; i < 100; ++i) {
-        entries.emplace_back(i % 7 == 0 ? kNaN : 100.0 - i, i);
+        mixed.emplace_back(i % 7 == 0 ? kNaN : 100.0 - i, i);  // 15 NaN, descending numbers
     }
-    const Entries sorted = LUT(entries).GetEntries();
-    ASSERT_EQ(sorted.size(), entries.size());
-    const std::size_t numbers = 100 - 15;  // 15 multiples of 7 below 100
+    const Entries sorted = LUT(mixed).GetEntries();
     for (std::size_t i = 0; i < sorted.size(); ++i) {
-        EXPECT_EQ(std::isnan(sorted[i].first), i >= numbers) << i;
-        if (i > 0 && i < numbers) {
-            EXPECT_LT(sorted[i - 1].first, sorted[i].first) << i;
-        }
+        EXPECT_EQ(std::isnan(sorted[i].first), i >= 85) << i;
+        EXPECT_TRUE(i == 0 || !(sorted[i].first <= sorted[i - 1].first)) << i;  // ascending
     }
 }
 
-TEST(LUT, ReportsEntriesCountRangeAndOutputsByIndex) {
+TEST(LUT, ReportsEntriesRangeAndOutputsByIndex) {
     const Entries entries{{-2, 4}, {3, 9}, {8, 1}};
-    const LUT lut(entries);
+    LUT lut(entries);
     Entries out{{0, 0}};
     lut.GetEntries(out);
     EXPECT_EQ(out, entries);
-    EXPECT_EQ(lut.GetEntryCount(), 3u);
     double min = 0;
     double max = 0;
     lut.GetInputValueRange(min, max);
     EXPECT_EQ(min, -2);
     EXPECT_EQ(max, 8);
-    EXPECT_EQ(lut.GetValueByIndex(0), 4);
-    EXPECT_EQ(lut.GetValueByIndex(2), 1);
-    EXPECT_EQ(lut.GetValueByIndex(1ull << 40), 1);  // past the end: the last, not a stray read
-}
-
-TEST(LUT, CopiesAreIndependent) {
-    LUT copy(Entries{{0, 0}, {1, 1}});
-    const LUT source(Entries{{0, 5}, {1, 6}});
-    copy = source;
-    EXPECT_EQ(copy.GetEntries(), source.GetEntries());
-    const LUT moved(std::move(copy));
+    EXPECT_EQ(lut.GetValueByIndex(1), 9);
+    EXPECT_EQ(lut.GetValueByIndex(1ull << 40), 1);  // past the end: the last, no stray read
+    lut = LUT(Entries{{0, 5}, {1, 6}});
+    const LUT moved(std::move(lut));
+    EXPECT_EQ(lut.GetEntryCount(), 2u);  // NOLINT(bugprone-use-after-move): moving copies
     EXPECT_EQ(moved.GetValue(0.5), 5.5);
-    EXPECT_EQ(copy.GetEntryCount(), 2u);  // NOLINT(bugprone-use-after-move): moving copies
 }
 
 TEST(LUT, ClassicTablesHave256WholeByteOutputsAtInputs0To255) {
@@ -138,22 +111,20 @@ TEST(LUT, ClassicTablesHave256WholeByteOutputsAtInputs0To255) {
         entries.emplace_back(i, 255 - i);
     }
     EXPECT_TRUE(IsClassicLUT(LUT(entries)));
-    for (double output : {255.5, 256.0, -1.0, kNaN, kInf}) {
+    for (double output : {255.5, 256.0, -1.0, kNaN}) {
         Entries changed = entries;
         changed[100].second = output;
         EXPECT_FALSE(IsClassicLUT(LUT(changed))) << output;
     }
     Entries shifted = entries;
-    for (auto& entry : shifted) {
-        entry.first += 1;
-    }
+    shifted.back().first = 256;
     EXPECT_FALSE(IsClassicLUT(LUT(shifted)));
     entries.pop_back();
     EXPECT_FALSE(IsClassicLUT(LUT(entries)));
 }
 
 TEST(LUT, ThrowsWhenByteVectorHasNot256Entries) {
-    for (std::size_t size : {255u, 257u, 0u}) {
+    for (std::size_t size : {255u, 257u}) {
         const auto failure =
             kubo_test::Catch<kora::DataException>([&] { LUT(std::vector<unsigned char>(size)); });
         ASSERT_TRUE(failure);

@@ -14,9 +14,9 @@ namespace kubo_test {
 
 /// Shared by an original CountingCRS and all its clones.
 struct CRSLedger {
-    /// Reported by every member of the family; change it to make held clones report it.
+    /// Reported by every member of the family, so changing it changes held clones too.
     unsigned int dimension = 3;
-    /// Destructor runs per object, indexed by serial number (creation order).
+    /// Destructor runs per object, indexed by serial number (the order of creation).
     std::vector<int> destructions;
 
     std::size_t Created() const { return destructions.size(); }
@@ -40,7 +40,6 @@ public:
 
     unsigned int GetDimension() const override { return m_ledger->dimension; }
     ICRS* Clone() const override { return new CountingCRS(m_ledger); }
-
     std::size_t GetSerial() const { return m_serial; }
 
 private:
@@ -48,9 +47,9 @@ private:
     std::size_t m_serial;
 };
 
-/// Serial number of the CountingCRS `crs` points at.
+/// Serial number of the CountingCRS that `crs` points at; the largest size_t for null.
 inline std::size_t SerialOf(const kora::ogc::cs::ICRS* crs) {
-    return dynamic_cast<const CountingCRS&>(*crs).GetSerial();
+    return crs ? dynamic_cast<const CountingCRS&>(*crs).GetSerial() : static_cast<std::size_t>(-1);
 }
 
 }  // namespace kubo_test

@@ -11,6 +11,7 @@
 #include "vrkframework/basic/kubo/controlpoints/imagelocationpolicy.h"
 #include "vrkframework/basic/kubo/controlpoints/location.h"
 #include "vrkframework/basic/kubo/kuboapi.h"
+#include "vrkframework/basic/kubo/luts/directindex.h"
 #include "vrkframework/basic/kubo/luts/lut.h"
 #include "vrkframework/basic/kubo/luts/pct.h"
 #include "vrkframework/basic/kubo/raster/datatype.h"
