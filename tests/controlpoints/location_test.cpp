@@ -4,8 +4,8 @@
 
 #include <limits>
 
-#include "vrkframework/basic/kubo/controlpoints/groundlocation.h"
-#include "vrkframework/basic/kubo/controlpoints/imagelocation.h"
+#include "vrkframework/basic/kubo/controlpoints/groundlocationpolicy.h"
+#include "vrkframework/basic/kubo/controlpoints/imagelocationpolicy.h"
 
 namespace {
 

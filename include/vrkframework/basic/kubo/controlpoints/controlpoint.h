@@ -5,8 +5,8 @@
 #include <string>
 #include <vector>
 
-#include "vrkframework/basic/kubo/controlpoints/groundlocation.h"
-#include "vrkframework/basic/kubo/controlpoints/imagelocation.h"
+#include "vrkframework/basic/kubo/controlpoints/groundlocationpolicy.h"
+#include "vrkframework/basic/kubo/controlpoints/imagelocationpolicy.h"
 #include "vrkframework/basic/kubo/kuboapi.h"
 
 namespace kora::kubo {

@@ -1,7 +1,9 @@
-// Names of a ground position: x, y, z and which of them are known.
+// A ground position: the policy naming its x, y, z and populated axes, and the
+// `GroundLocation` type.
 #ifndef VRKFRAMEWORK_BASIC_KUBO_CONTROLPOINTS_GROUNDLOCATIONPOLICY_H
 #define VRKFRAMEWORK_BASIC_KUBO_CONTROLPOINTS_GROUNDLOCATIONPOLICY_H
 
+#include "vrkframework/basic/kubo/controlpoints/location.h"
 #include "vrkframework/basic/kubo/kuboapi.h"
 
 namespace kora::kubo {
@@ -51,6 +53,9 @@ private:
     double* m_coordinates = nullptr;
     double** m_matrix = nullptr;
 };
+
+/// x, y and z with their 3 x 3 matrix and populated-axes code.
+using GroundLocation = Location<3, GroundLocationPolicy>;
 
 }  // namespace kora::kubo
 

@@ -1,7 +1,8 @@
-// Names of an image position: column and row.
+// An image position: the policy naming its column and row, and the `ImageLocation` type.
 #ifndef VRKFRAMEWORK_BASIC_KUBO_CONTROLPOINTS_IMAGELOCATIONPOLICY_H
 #define VRKFRAMEWORK_BASIC_KUBO_CONTROLPOINTS_IMAGELOCATIONPOLICY_H
 
+#include "vrkframework/basic/kubo/controlpoints/location.h"
 #include "vrkframework/basic/kubo/kuboapi.h"
 
 namespace kora::kubo {
@@ -35,6 +36,9 @@ private:
     double* m_coordinates = nullptr;
     double** m_matrix = nullptr;
 };
+
+/// Column and row with their 2 x 2 matrix.
+using ImageLocation = Location<2, ImageLocationPolicy>;
 
 }  // namespace kora::kubo
 

@@ -2,11 +2,10 @@
 #ifndef VRKFRAMEWORK_BASIC_KUBO_LUTS_LUT_H
 #define VRKFRAMEWORK_BASIC_KUBO_LUTS_LUT_H
 
-#include <utility>  // std::pair
 #include <vector>
 
 #include "vrkframework/basic/kubo/kuboapi.h"
-#include "vrkframework/basic/kubo/luts/directindex.h"
+#include "vrkframework/basic/kubo/luts/breakpointtable.h"
 
 namespace kora::kubo {
 
@@ -16,10 +15,8 @@ namespace kora::kubo {
 ///
 /// Every table holds at least the breakpoints it was built from. There is no move: moving
 /// a table copies it, so no table is ever left without breakpoints.
-class KUBO_API LUT {
+class KUBO_API LUT : public detail::BreakpointTable<double> {
 public:
-    using Entry = std::pair<double, double>;
-
     /// A classic 8-bit table: breakpoint i is (i, values[i]).
     /// @throws kora::DataException when `values` does not hold exactly 256 bytes.
     explicit LUT(const std::vector<unsigned char>& values);
@@ -33,22 +30,13 @@ public:
     LUT& operator=(const LUT& other) = default;
     ~LUT() = default;
 
-    std::vector<Entry> GetEntries() const { return m_entries; }
-    void GetEntries(std::vector<Entry>& out) const { out = m_entries; }
-    unsigned int GetEntryCount() const { return static_cast<unsigned int>(m_entries.size()); }
-    /// Inputs of the first and the last breakpoint.
-    void GetInputValueRange(double& min, double& max) const {
-        min = m_entries.front().first;
-        max = m_entries.back().first;
-    }
-
     /// The output for `x`. A whole `x` whose truncation indexes a breakpoint of that input
     /// answers directly; otherwise the first breakpoint not below `x` is searched: none
     /// gives the last output, the first breakpoint (also for NaN) or an equal input gives
     /// that output, anything else interpolates with the breakpoint before it.
     double GetValue(double x) const {
         // Inline so that a classic table answers without a call; the search is not.
-        if (const Entry* direct = detail::FindDirect(m_entries, x)) {
+        if (const Entry* direct = FindDirect(x)) {
             return direct->second;
         }
         return GetSearchedValue(x);
@@ -56,12 +44,10 @@ public:
 
     /// Output of breakpoint `i`. An index past the end is not checked against; it reads
     /// the last breakpoint rather than memory outside the table.
-    double GetValueByIndex(unsigned long long i) const;
+    double GetValueByIndex(unsigned long long i) const { return GetClampedValue(i); }
 
 private:
     double GetSearchedValue(double x) const;
-
-    std::vector<Entry> m_entries;
 };
 
 /// True when `lut` has 256 breakpoints with the inputs 0 to 255 and whole outputs from 0

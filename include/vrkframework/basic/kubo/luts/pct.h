@@ -3,11 +3,10 @@
 #define VRKFRAMEWORK_BASIC_KUBO_LUTS_PCT_H
 
 #include <cstdint>  // std::uint32_t
-#include <utility>  // std::pair
 #include <vector>
 
 #include "vrkframework/basic/kubo/kuboapi.h"
-#include "vrkframework/basic/kubo/luts/directindex.h"
+#include "vrkframework/basic/kubo/luts/breakpointtable.h"
 
 namespace kora::kubo {
 
@@ -26,10 +25,9 @@ struct RGBTuple {
 ///
 /// Every table holds at least the breakpoints it was built from. There is no move: moving
 /// a table copies it, so no table is ever left without breakpoints.
-class KUBO_API PCT {
+class KUBO_API PCT : public detail::BreakpointTable<RGBTuple<unsigned char>> {
 public:
     using Colour = RGBTuple<unsigned char>;
-    using Entry = std::pair<double, Colour>;
 
     /// A classic 8-bit table: breakpoint i is (i, colours[i]).
     /// @throws kora::DataException when `colours` does not hold exactly 256 colours.
@@ -46,21 +44,12 @@ public:
     PCT& operator=(const PCT& other) = default;
     ~PCT() = default;
 
-    std::vector<Entry> GetEntries() const { return m_entries; }
-    void GetEntries(std::vector<Entry>& out) const { out = m_entries; }
-    unsigned int GetEntryCount() const { return static_cast<unsigned int>(m_entries.size()); }
-    /// Inputs of the first and the last breakpoint.
-    void GetInputValueRange(double& min, double& max) const {
-        min = m_entries.front().first;
-        max = m_entries.back().first;
-    }
-
     /// The colour for `x`, found as `LUT::GetValue` finds an output; between breakpoints
     /// each component is (upper - lower) x t + lower, with t the position of `x` between
     /// their inputs, truncated toward zero.
     Colour GetValue(double x) const {
         // Inline so that a classic table answers without a call; the search is not.
-        if (const Entry* direct = detail::FindDirect(m_entries, x)) {
+        if (const Entry* direct = FindDirect(x)) {
             return direct->second;
         }
         const std::uint32_t packed = GetSearchedColour(x);
@@ -70,13 +59,11 @@ public:
 
     /// Colour of breakpoint `i`. An index past the end is not checked against; it reads
     /// the last breakpoint rather than memory outside the table.
-    Colour GetValueByIndex(unsigned long long i) const;
+    Colour GetValueByIndex(unsigned long long i) const { return GetClampedValue(i); }
 
 private:
     // The colour comes back as red | green << 8 | blue << 16, which travels in a register.
     std::uint32_t GetSearchedColour(double x) const;
-
-    std::vector<Entry> m_entries;
 };
 
 /// True when `pct` has 256 breakpoints with the inputs 0 to 255, whatever their colours.

@@ -13,6 +13,16 @@ namespace kora::kubo::detail {
 /// Breakpoints of a classic 8-bit table, whose inputs are 0 to 255.
 constexpr std::size_t kClassicEntryCount = 256;
 
+/// The entries of a classic table: entry i is (i, values[i]) for i from 0 to 255.
+template <class Entry, class Source>
+std::vector<Entry> ClassicEntries(const Source* values) {
+    std::vector<Entry> entries(kClassicEntryCount);
+    for (std::size_t i = 0; i < kClassicEntryCount; ++i) {
+        entries[i] = {static_cast<double>(i), values[i]};
+    }
+    return entries;
+}
+
 /// Sorts (input, value) entries by input unless no neighbour pair is out of order.
 template <class Entry>
 void SortByInput(std::vector<Entry>& entries) {

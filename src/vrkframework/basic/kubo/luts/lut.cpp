@@ -1,7 +1,7 @@
 // Lookup table construction, lookup and the classic-table test.
 #include "vrkframework/basic/kubo/luts/lut.h"
 
-#include <algorithm>  // std::all_of, std::min
+#include <algorithm>  // std::all_of
 
 #include "vrkframework/basic/kubo/luts/breakpoints.h"
 #include "vrkframework/platform/exception.h"
@@ -12,12 +12,18 @@ namespace {
 
 constexpr char kSourcePath[] = "vrkframework/basic/kubo/luts/lut";
 
-std::vector<LUT::Entry> ClassicEntries(const unsigned char* values) {
-    std::vector<LUT::Entry> entries(detail::kClassicEntryCount);
-    for (std::size_t i = 0; i < entries.size(); ++i) {
-        entries[i] = {static_cast<double>(i), values[i]};
+// The bytes of a classic table, once their count is checked.
+const unsigned char* ClassicBytes(const std::vector<unsigned char>& values) {
+    if (values.size() != detail::kClassicEntryCount) {
+        throw kora::DataException(
+            kora::FormatString("LUT must have 256 entries, %d given.",
+                               static_cast<int>(values.size())),
+            kSourcePath,
+            "__cdecl kora::kubo::LUT::LUT(const class std::vector<unsigned char,class "
+            "std::allocator<unsigned char> > &)",
+            50);
     }
-    return entries;
+    return values.data();
 }
 
 // A whole output from 0 to 255 survives truncation to a byte and back unchanged.
@@ -28,20 +34,9 @@ bool IsByteValue(double output) {
 
 }  // namespace
 
-LUT::LUT(const std::vector<unsigned char>& values) {
-    if (values.size() != detail::kClassicEntryCount) {
-        throw kora::DataException(
-            kora::FormatString("LUT must have 256 entries, %d given.",
-                               static_cast<int>(values.size())),
-            kSourcePath,
-            "__cdecl kora::kubo::LUT::LUT(const class std::vector<unsigned char,class "
-            "std::allocator<unsigned char> > &)",
-            50);
-    }
-    m_entries = ClassicEntries(values.data());
-}
+LUT::LUT(const std::vector<unsigned char>& values) : LUT(ClassicBytes(values)) {}
 
-LUT::LUT(const std::vector<Entry>& entries) : m_entries(entries) {
+LUT::LUT(const std::vector<Entry>& entries) : BreakpointTable(entries) {
     if (entries.size() < 2) {
         throw kora::ParameterException(
             "LUT", kora::ParameterException::PARAMETER_TOO_FEW_ITEMS,
@@ -55,7 +50,7 @@ LUT::LUT(const std::vector<Entry>& entries) : m_entries(entries) {
     detail::SortByInput(m_entries);
 }
 
-LUT::LUT(const unsigned char* values) : m_entries(ClassicEntries(values)) {}
+LUT::LUT(const unsigned char* values) : BreakpointTable(detail::ClassicEntries<Entry>(values)) {}
 
 double LUT::GetSearchedValue(double x) const {
     const detail::Bracket at = detail::Search(m_entries, x);
@@ -67,10 +62,6 @@ double LUT::GetSearchedValue(double x) const {
     // Kept in this order of operations: a precomputed slope would round differently.
     return (x - lower.first) / (upper.first - lower.first) * (upper.second - lower.second) +
            lower.second;
-}
-
-double LUT::GetValueByIndex(unsigned long long i) const {
-    return m_entries[std::min<unsigned long long>(i, m_entries.size() - 1)].second;
 }
 
 bool IsClassicLUT(const LUT& lut) {

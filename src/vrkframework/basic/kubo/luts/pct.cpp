@@ -1,7 +1,6 @@
 // Pseudocolour table construction, lookup and the classic-table test.
 #include "vrkframework/basic/kubo/luts/pct.h"
 
-#include <algorithm>  // std::min
 #include <array>
 #include <cstdint>  // std::uint32_t
 
@@ -14,12 +13,18 @@ namespace {
 
 constexpr char kSourcePath[] = "vrkframework/basic/kubo/luts/pct";
 
-std::vector<PCT::Entry> ClassicEntries(const PCT::Colour* colours) {
-    std::vector<PCT::Entry> entries(detail::kClassicEntryCount);
-    for (std::size_t i = 0; i < entries.size(); ++i) {
-        entries[i] = {static_cast<double>(i), colours[i]};
+// The colours of a classic table, once their count is checked.
+const PCT::Colour* ClassicColours(const std::vector<PCT::Colour>& colours) {
+    if (colours.size() != detail::kClassicEntryCount) {
+        throw kora::DataException(kora::FormatString("PCT must have 256 entries, %d given.",
+                                                     static_cast<int>(colours.size())),
+                                  kSourcePath,
+                                  "__cdecl kora::kubo::PCT::PCT(const class std::vector<struct "
+                                  "kora::kubo::RGBTuple<unsigned char>,class std::allocator<struct "
+                                  "kora::kubo::RGBTuple<unsigned char> > > &)",
+                                  54);
     }
-    return entries;
+    return colours.data();
 }
 
 std::vector<PCT::Colour> InterleavePlanes(const unsigned char* planes) {
@@ -43,10 +48,10 @@ constexpr auto kByteValues = [] {
 
 // (upper - lower) x t + lower: the difference of two whole doubles is the exact signed
 // difference, so a falling component comes out right. With t in [0, 1] the result lies
-// between the two components and truncating it to an int is always defined.
+// between the two components, so it truncates to a byte value without any masking.
 std::uint32_t Blend(unsigned char lower, unsigned char upper, double t) {
     const double from = kByteValues[lower];
-    return static_cast<unsigned char>(static_cast<int>((kByteValues[upper] - from) * t + from));
+    return static_cast<std::uint32_t>(static_cast<int>((kByteValues[upper] - from) * t + from));
 }
 
 // The colour travels as red | green << 8 | blue << 16: an integer is returned in a register,
@@ -59,20 +64,10 @@ std::uint32_t Pack(const PCT::Colour& colour) { return Pack(colour.r, colour.g, 
 
 }  // namespace
 
-PCT::PCT(const std::vector<Colour>& colours) {
-    if (colours.size() != detail::kClassicEntryCount) {
-        throw kora::DataException(kora::FormatString("PCT must have 256 entries, %d given.",
-                                                     static_cast<int>(colours.size())),
-                                  kSourcePath,
-                                  "__cdecl kora::kubo::PCT::PCT(const class std::vector<struct "
-                                  "kora::kubo::RGBTuple<unsigned char>,class std::allocator<struct "
-                                  "kora::kubo::RGBTuple<unsigned char> > > &)",
-                                  54);
-    }
-    m_entries = ClassicEntries(colours.data());
-}
+PCT::PCT(const std::vector<Colour>& colours)
+    : BreakpointTable(detail::ClassicEntries<Entry>(ClassicColours(colours))) {}
 
-PCT::PCT(const std::vector<Entry>& entries) : m_entries(entries) {
+PCT::PCT(const std::vector<Entry>& entries) : BreakpointTable(entries) {
     if (entries.size() < 2) {
         throw kora::ParameterException(
             "PCT", kora::ParameterException::PARAMETER_TOO_FEW_ITEMS,
@@ -87,7 +82,7 @@ PCT::PCT(const std::vector<Entry>& entries) : m_entries(entries) {
 }
 
 PCT::PCT(const unsigned char* planes)
-    : m_entries(ClassicEntries(InterleavePlanes(planes).data())) {}
+    : BreakpointTable(detail::ClassicEntries<Entry>(InterleavePlanes(planes).data())) {}
 
 std::uint32_t PCT::GetSearchedColour(double x) const {
     const detail::Bracket at = detail::Search(m_entries, x);
@@ -104,10 +99,6 @@ std::uint32_t PCT::GetSearchedColour(double x) const {
     const double t = below > 0.0 ? below : 0.0;
     return Pack(Blend(lower.second.r, upper.second.r, t), Blend(lower.second.g, upper.second.g, t),
                 Blend(lower.second.b, upper.second.b, t));
-}
-
-PCT::Colour PCT::GetValueByIndex(unsigned long long i) const {
-    return m_entries[std::min<unsigned long long>(i, m_entries.size() - 1)].second;
 }
 
 bool IsClassicPCT(const PCT& pct) { return detail::HasClassicInputs(pct.GetEntries()); }
