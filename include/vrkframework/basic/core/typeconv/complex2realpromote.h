@@ -11,11 +11,13 @@ namespace typeconv {
 /// Converts complex samples of components A into real samples of B: the real part follows
 /// the rules of Promote<A, B>; the imaginary part is ignored (no magnitude is taken).
 template <class A, class B>
-class KUBO_API Complex2RealPromote : public detail::PromoteOperations<A, B, detail::SampleLayout::kComplexToReal> {};
+class KUBO_API Complex2RealPromote
+    : public detail::PromoteOperations<A, B, detail::SampleLayout::kComplexToReal> {};
 
 // Instantiated for every pair of component types inside the library.
-#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                                 \
-    extern template class KUBO_API detail::PromoteOperations<A, B, detail::SampleLayout::kComplexToReal>; \
+#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                        \
+    extern template class KUBO_API                                             \
+        detail::PromoteOperations<A, B, detail::SampleLayout::kComplexToReal>; \
     extern template class KUBO_API Complex2RealPromote<A, B>;
 KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_DETAIL_EXTERN_FAMILY)
 #undef KUBO_DETAIL_EXTERN_FAMILY

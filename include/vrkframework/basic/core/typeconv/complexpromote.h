@@ -11,11 +11,13 @@ namespace typeconv {
 /// Converts complex samples of components A into complex samples of components B: both
 /// components of each sample, real part first, follow the rules of Promote<A, B>.
 template <class A, class B>
-class KUBO_API ComplexPromote : public detail::PromoteOperations<A, B, detail::SampleLayout::kComplex> {};
+class KUBO_API ComplexPromote
+    : public detail::PromoteOperations<A, B, detail::SampleLayout::kComplex> {};
 
 // Instantiated for every pair of component types inside the library.
-#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                                 \
-    extern template class KUBO_API detail::PromoteOperations<A, B, detail::SampleLayout::kComplex>; \
+#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                  \
+    extern template class KUBO_API                                       \
+        detail::PromoteOperations<A, B, detail::SampleLayout::kComplex>; \
     extern template class KUBO_API ComplexPromote<A, B>;
 KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_DETAIL_EXTERN_FAMILY)
 #undef KUBO_DETAIL_EXTERN_FAMILY

@@ -12,16 +12,16 @@
 /// Applies X(A, B) to every ordered pair of component types, source-major, in dispatch
 /// order. A macro cannot expand itself, so the ten types are listed here a second time;
 /// the static_assert below keeps both lists equal to ComponentTypes.
-#define KUBO_FOR_EACH_COMPONENT_PAIR(X)            \
-    KUBO_DETAIL_PAIRS_FROM(X, char)                \
-    KUBO_DETAIL_PAIRS_FROM(X, unsigned char)       \
-    KUBO_DETAIL_PAIRS_FROM(X, short)               \
-    KUBO_DETAIL_PAIRS_FROM(X, unsigned short)      \
-    KUBO_DETAIL_PAIRS_FROM(X, int)                 \
-    KUBO_DETAIL_PAIRS_FROM(X, unsigned int)        \
-    KUBO_DETAIL_PAIRS_FROM(X, float)               \
-    KUBO_DETAIL_PAIRS_FROM(X, double)              \
-    KUBO_DETAIL_PAIRS_FROM(X, std::int64_t)        \
+#define KUBO_FOR_EACH_COMPONENT_PAIR(X)       \
+    KUBO_DETAIL_PAIRS_FROM(X, char)           \
+    KUBO_DETAIL_PAIRS_FROM(X, unsigned char)  \
+    KUBO_DETAIL_PAIRS_FROM(X, short)          \
+    KUBO_DETAIL_PAIRS_FROM(X, unsigned short) \
+    KUBO_DETAIL_PAIRS_FROM(X, int)            \
+    KUBO_DETAIL_PAIRS_FROM(X, unsigned int)   \
+    KUBO_DETAIL_PAIRS_FROM(X, float)          \
+    KUBO_DETAIL_PAIRS_FROM(X, double)         \
+    KUBO_DETAIL_PAIRS_FROM(X, std::int64_t)   \
     KUBO_DETAIL_PAIRS_FROM(X, std::uint64_t)
 
 #define KUBO_DETAIL_PAIRS_FROM(X, A) \

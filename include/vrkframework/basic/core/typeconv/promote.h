@@ -22,7 +22,7 @@ template <class A, class B>
 class KUBO_API Promote : public detail::PromoteOperations<A, B, detail::SampleLayout::kReal> {};
 
 // Instantiated for every pair of component types inside the library.
-#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                                 \
+#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                                          \
     extern template class KUBO_API detail::PromoteOperations<A, B, detail::SampleLayout::kReal>; \
     extern template class KUBO_API Promote<A, B>;
 KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_DETAIL_EXTERN_FAMILY)

@@ -11,11 +11,13 @@ namespace typeconv {
 /// Converts real samples of A into complex samples of components B: the real part follows
 /// the rules of Promote<A, B>, the imaginary part is 0.
 template <class A, class B>
-class KUBO_API Real2ComplexPromote : public detail::PromoteOperations<A, B, detail::SampleLayout::kRealToComplex> {};
+class KUBO_API Real2ComplexPromote
+    : public detail::PromoteOperations<A, B, detail::SampleLayout::kRealToComplex> {};
 
 // Instantiated for every pair of component types inside the library.
-#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                                 \
-    extern template class KUBO_API detail::PromoteOperations<A, B, detail::SampleLayout::kRealToComplex>; \
+#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                        \
+    extern template class KUBO_API                                             \
+        detail::PromoteOperations<A, B, detail::SampleLayout::kRealToComplex>; \
     extern template class KUBO_API Real2ComplexPromote<A, B>;
 KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_DETAIL_EXTERN_FAMILY)
 #undef KUBO_DETAIL_EXTERN_FAMILY

@@ -5,7 +5,7 @@
 
 namespace typeconv {
 
-#define KUBO_DETAIL_INSTANTIATE_FAMILY(A, B)                                      \
+#define KUBO_DETAIL_INSTANTIATE_FAMILY(A, B)                                              \
     template class detail::PromoteOperations<A, B, detail::SampleLayout::kComplexToReal>; \
     template class Complex2RealPromote<A, B>;
 KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_DETAIL_INSTANTIATE_FAMILY)

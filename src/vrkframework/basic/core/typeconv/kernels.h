@@ -9,6 +9,7 @@
 #include <type_traits>
 
 #include "vrkframework/basic/core/typeconv/promoteoperations.h"
+#include "vrkframework/basic/kubo/kuboapi.h"
 
 namespace typeconv::detail {
 
@@ -58,13 +59,13 @@ struct KernelSet {
 enum class KernelVariant { kBaseline, kAvx2 };
 
 /// The kernels of `variant`, or null when this build or this processor lacks them.
-const KernelSet* FindKernels(KernelVariant variant);
+KUBO_API const KernelSet* FindKernels(KernelVariant variant);
 /// The fastest kernels this processor runs, chosen on first use.
-const KernelSet& ActiveKernels();
+KUBO_API const KernelSet& ActiveKernels();
 
 /// Runs the conversion of `count` samples of a family's layout.
-void RunPromote(const KernelSet& kernels, SampleLayout layout, std::size_t from, std::size_t to,
-                const void* src, void* dst, std::size_t count);
+KUBO_API void RunPromote(const KernelSet& kernels, SampleLayout layout, std::size_t from,
+                         std::size_t to, const void* src, void* dst, std::size_t count);
 
 /// The bit-depth kernels treat counts as signed 32-bit values: below 1 converts nothing.
 constexpr bool IsPackedCountPositive(unsigned int count) {
@@ -78,8 +79,8 @@ constexpr bool IsPackedCountPositive(unsigned int count) {
 
 /// The framework's spelling of each component type, as function texts show it.
 constexpr std::array<const char*, kComponentCount> kComponentTypeNames = {
-    "char", "unsigned char", "short",  "unsigned short", "int",
-    "unsigned int", "float", "double", "__int64",        "unsigned __int64"};
+    "char",         "unsigned char", "short",  "unsigned short", "int",
+    "unsigned int", "float",         "double", "__int64",        "unsigned __int64"};
 
 // Defined by the kernel files, one per instruction set.
 const KernelSet& BaselineKernelSet();

@@ -43,10 +43,9 @@ void Copy(const void* src, void* dst, std::size_t count) {
 /// unsigned destination's kernel.
 template <class A, class B>
 constexpr ConvertKernel SelectConvertKernel() {
-    constexpr bool kSameBits = sizeof(A) == sizeof(B) && std::is_integral_v<A> &&
-                               std::is_integral_v<B> &&
-                               (std::is_signed_v<A> == std::is_signed_v<B> ||
-                                (std::is_signed_v<A> && sizeof(A) == 8));
+    constexpr bool kSameBits =
+        sizeof(A) == sizeof(B) && std::is_integral_v<A> && std::is_integral_v<B> &&
+        (std::is_signed_v<A> == std::is_signed_v<B> || (std::is_signed_v<A> && sizeof(A) == 8));
     if constexpr (std::is_same_v<A, B> || kSameBits) {
         return &Copy<sizeof(A)>;
     } else if constexpr (std::is_integral_v<A> && std::is_integral_v<B> &&
@@ -190,8 +189,7 @@ std::uint64_t Widen(T sample) {
 
 /// One-bit samples: eight low bits gathered into one byte, the first sample on top.
 template <class T>
-void PackOneBit(const T* __restrict samples, unsigned char* __restrict packed,
-                std::size_t count) {
+void PackOneBit(const T* __restrict samples, unsigned char* __restrict packed, std::size_t count) {
     for (std::size_t i = 0; i < count / 8; ++i) {
         unsigned int byte = 0;
         for (unsigned int j = 0; j < 8; ++j) {

@@ -10,7 +10,7 @@
 
 namespace typeconv {
 
-#define KUBO_DETAIL_INSTANTIATE_FAMILY(A, B)                                  \
+#define KUBO_DETAIL_INSTANTIATE_FAMILY(A, B)                                     \
     template class detail::PromoteOperations<A, B, detail::SampleLayout::kReal>; \
     template class Promote<A, B>;
 KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_DETAIL_INSTANTIATE_FAMILY)
@@ -32,11 +32,11 @@ std::string Signature(unsigned int bits, const char* typeName, const char* kerne
 }  // namespace
 
 void ThrowUnpackBitsTooWide(unsigned int bits, const char* typeName) {
-    throw kora::Exception(kTooWide, kSourcePath,
-                          Signature(bits, typeName, "Promote",
-                                    std::string("const unsigned char *,") + typeName +
-                                        " *,unsigned int"),
-                          390);
+    throw kora::Exception(
+        kTooWide, kSourcePath,
+        Signature(bits, typeName, "Promote",
+                  std::string("const unsigned char *,") + typeName + " *,unsigned int"),
+        390);
 }
 
 void ThrowPackBitsTooWide(unsigned int bits, const char* typeName) {

@@ -17,11 +17,11 @@ namespace typeconv::detail {
 namespace {
 
 template <class T>
-constexpr bool kIsSigned64 = std::is_integral_v<T> && std::is_signed_v<T> && sizeof(T) == 8;
+constexpr bool kIsSigned64 = std::is_integral_v<T>&& std::is_signed_v<T> && sizeof(T) == 8;
 template <class T>
-constexpr bool kIsUnsigned64 = std::is_integral_v<T> && std::is_unsigned_v<T> && sizeof(T) == 8;
+constexpr bool kIsUnsigned64 = std::is_integral_v<T>&& std::is_unsigned_v<T> && sizeof(T) == 8;
 template <class T>
-constexpr bool kIsNarrowSigned = std::is_integral_v<T> && std::is_signed_v<T> && sizeof(T) < 8;
+constexpr bool kIsNarrowSigned = std::is_integral_v<T>&& std::is_signed_v<T> && sizeof(T) < 8;
 
 template <class To, class From>
 inline To BitCast(From value) {
@@ -104,7 +104,7 @@ inline double Int64ToDouble(A x) {
     std::uint64_t high = bits >> 32;
     double highBias = 0x1.00000001p84;  // 2^84 + 2^52
     if constexpr (std::is_signed_v<A>) {
-        high ^= 0x80000000u;       // the signed high half, offset by 2^31 ...
+        high ^= 0x80000000u;         // the signed high half, offset by 2^31 ...
         highBias = 0x1.00000801p84;  // ... taken back out with 2^63
     }
     const double highPart = BitCast<double>(high | 0x4530000000000000u) - highBias;
@@ -120,8 +120,9 @@ inline float Int64ToFloat(A x) {
     const std::uint64_t bits = static_cast<std::uint64_t>(x);
     const std::uint64_t sticky = ((bits & 0x7FFu) + 0x7FFu) & 0x800u;
     const std::uint64_t odd = (bits & ~std::uint64_t{0x7FF}) | sticky;
-    const bool wide = std::is_signed_v<A> ? bits + (std::uint64_t{1} << 53) >= std::uint64_t{1} << 54
-                                          : bits >= std::uint64_t{1} << 53;
+    const bool wide = std::is_signed_v<A>
+                          ? bits + (std::uint64_t{1} << 53) >= std::uint64_t{1} << 54
+                          : bits >= std::uint64_t{1} << 53;
     return static_cast<float>(Int64ToDouble(static_cast<A>(wide ? odd : bits)));
 }
 
@@ -144,7 +145,8 @@ inline B IntegerToFloating(A x) {
 /// float(UINT32_MAX) is 2^32, one past the range; the double forms are in range.
 template <class A, class B>
 constexpr A LargestConvertibleBelow(A limit) {
-    return static_cast<long double>(limit) <= static_cast<long double>(std::numeric_limits<B>::max())
+    return static_cast<long double>(limit) <=
+                   static_cast<long double>(std::numeric_limits<B>::max())
                ? limit
                : limit - limit * std::numeric_limits<A>::epsilon() / 2;
 }

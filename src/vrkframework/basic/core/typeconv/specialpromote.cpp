@@ -5,7 +5,7 @@
 
 namespace typeconv {
 
-#define KUBO_DETAIL_INSTANTIATE_PACKED(N, T)   \
+#define KUBO_DETAIL_INSTANTIATE_PACKED(N, T)     \
     template struct BitDepthPromote<N, T, 0, 0>; \
     template class SpecialPromote<N, T, 0>;      \
     template class SpecialPromote<N, T, 1>;

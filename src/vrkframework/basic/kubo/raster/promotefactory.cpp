@@ -25,8 +25,8 @@ using typeconv::priv::NullDataType;
 
 template <template <class, class> class Family>
 using PairDispatch =
-    typedispatch::ExtendDispatchTypes<typedispatch::Factory2Template<Family, typeconv::IPromote>,
-                                      2, ComponentTypes, ComponentTypes, NullDataType>;
+    typedispatch::ExtendDispatchTypes<typedispatch::Factory2Template<Family, typeconv::IPromote>, 2,
+                                      ComponentTypes, ComponentTypes, NullDataType>;
 
 using InnerFactoryDispatch = typedispatch::ExtendDispatchTypes<
     typedispatch::Factory1Template<PromoteFactory::InnerFactory, IPromoteFactory>, 1,

@@ -39,7 +39,7 @@ typeconv::IPromote* NewSpecialPromote(unsigned int bits, bool pack, std::index_s
 
 template <class T>
 typeconv::IPromote* PromoteFactory::InnerFactory<T>::Create(const DataType& from,
-                                                           const DataType& to) const {
+                                                            const DataType& to) const {
     if constexpr (std::is_floating_point_v<T>) {
         return nullptr;
     } else {
