@@ -8,6 +8,7 @@
 #ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_SATURATE_H
 #define VRKFRAMEWORK_BASIC_CORE_TYPECONV_SATURATE_H
 
+#include <cmath>  // std::copysign, std::fabs, std::trunc
 #include <cstdint>
 #include <cstring>  // std::memcpy
 #include <limits>
@@ -151,34 +152,57 @@ constexpr A LargestConvertibleBelow(A limit) {
                : limit - limit * std::numeric_limits<A>::epsilon() / 2;
 }
 
-/// Truncates c in [0, 2^32) with signed 32-bit conversions, which vectorise.
+/// Truncates c in [0, 2^32).
 template <class A>
 inline std::uint32_t TruncateToUInt32(A c) {
+#if defined(__AVX2__)
+    // trunc(c) + 2^52 holds the integer in the low bits of its mantissa.
+    return static_cast<std::uint32_t>(
+        BitCast<std::uint64_t>(std::trunc(static_cast<double>(c)) + 0x1p52));
+#else
+    // Signed 32-bit conversions of the value below 2^31 and of the value less 2^31.
     constexpr A kTwo31 = A(2147483648.0);
     const bool high = c >= kTwo31;
     // Subtracting a selected constant, not selecting a difference: a floating operation
     // inside a select is not evaluated for every lane, which blocks vectorisation.
     const std::int32_t low = static_cast<std::int32_t>(c - (high ? kTwo31 : A(0)));
     return static_cast<std::uint32_t>(low) + (high ? 0x80000000u : 0u);
+#endif
 }
 
 /// Truncates c in [0, 2^64).
 template <class A>
 inline std::uint64_t TruncateToUInt64(A c) {
 #if defined(__AVX2__)
-    // From the bits: AVX2 has no 64-bit conversion but shifts each lane by its own count.
-    const std::uint64_t bits = BitCast<std::uint64_t>(static_cast<double>(c));
-    const std::int64_t exponent = static_cast<std::int64_t>(bits >> 52) - 1075;  // c = m * 2^e
-    const std::uint64_t mantissa = (bits & 0xFFFFFFFFFFFFFu) | 0x10000000000000u;
-    const std::uint64_t left = static_cast<std::uint64_t>(exponent > 0 ? exponent : 0);
-    const std::int64_t right = exponent < 0 ? -exponent : 0;
-    return (mantissa << left) >> static_cast<std::uint64_t>(right < 63 ? right : 63);
+    // AVX2 has no 64-bit conversion: the two halves of trunc(c) are exact doubles below
+    // 2^32, and each reads as an integer from the mantissa of its sum with 2^52.
+    const double whole = std::trunc(static_cast<double>(c));
+    const double high = std::trunc(whole * 0x1p-32);
+    const double low = whole - high * 0x1p32;
+    const std::uint64_t bias = BitCast<std::uint64_t>(0x1p52);
+    return (BitCast<std::uint64_t>(high + 0x1p52) ^ bias) << 32 |
+           (BitCast<std::uint64_t>(low + 0x1p52) ^ bias);
 #else
     constexpr A kTwo63 = A(9223372036854775808.0);
     const bool high = c >= kTwo63;
     const std::int64_t low = static_cast<std::int64_t>(c - (high ? kTwo63 : A(0)));
     return static_cast<std::uint64_t>(low) + (high ? std::uint64_t{1} << 63 : 0u);
 #endif
+}
+
+/// Clamps y to [+0, limit] (limit at least 0; NaN gives +0) on its bit pattern: positive
+/// floating values order like their bits read as signed integers and every negative one
+/// (-0 too) reads below +0. Integer min and max vectorise where floating selects feeding
+/// a conversion end up as selects on the converted, narrowed values.
+template <class A>
+inline A ClampMagnitude(A y, A limit) {
+    using Bits = std::conditional_t<sizeof(A) == 4, std::int32_t, std::int64_t>;
+    constexpr Bits kInfinity = static_cast<Bits>(sizeof(A) == 4 ? 0x7F800000 : 0x7FF0000000000000);
+    const Bits bits = BitCast<Bits>(y);
+    const Bits limitBits = BitCast<Bits>(limit);
+    Bits clamped = bits > 0 ? bits : 0;
+    clamped = clamped < limitBits ? clamped : limitBits;
+    return BitCast<A>(bits > kInfinity ? Bits{0} : clamped);
 }
 
 /// float or double into char, short, int: y = x + 0.5 at or above 0, x - 0.5 below (half
@@ -189,16 +213,23 @@ template <class B, class A>
 inline B FloatingToNarrowSigned(A x) {
     constexpr A kHigh = static_cast<A>(std::numeric_limits<B>::max());
     constexpr A kLow = static_cast<A>(std::numeric_limits<B>::lowest());
-    constexpr A kCeiling = LargestConvertibleBelow<A, B>(kHigh);
-    const A y = x + (x >= A(0) ? A(0.5) : A(-0.5));
-    A c = y > kLow ? y : kLow;  // NaN takes kLow here
-    c = c < kCeiling ? c : kCeiling;
     if constexpr (sizeof(B) < 4) {
-        return static_cast<B>(static_cast<std::int32_t>(y == y ? c : A(0)));
-    } else if constexpr (kCeiling == kHigh) {
-        return static_cast<B>(c);
+        // On the magnitude: |y| = |x| + 0.5 rounds like y in both directions; clamped to
+        // -minimum, truncated, signed, then capped at the maximum.
+        const A magnitude = ClampMagnitude(std::fabs(x) + A(0.5), -kLow);
+        const std::int32_t value = static_cast<std::int32_t>(std::copysign(magnitude, x));
+        constexpr std::int32_t kMax = std::numeric_limits<B>::max();
+        return static_cast<B>(value < kMax ? value : kMax);
     } else {
-        return y >= kHigh ? std::numeric_limits<B>::max() : static_cast<B>(c);
+        constexpr A kCeiling = LargestConvertibleBelow<A, B>(kHigh);
+        const A y = x + (x >= A(0) ? A(0.5) : A(-0.5));
+        A c = y > kLow ? y : kLow;  // NaN takes kLow, INT32_MIN, here
+        c = c < kCeiling ? c : kCeiling;
+        if constexpr (kCeiling == kHigh) {
+            return static_cast<B>(c);
+        } else {
+            return y >= kHigh ? std::numeric_limits<B>::max() : static_cast<B>(c);
+        }
     }
 }
 
@@ -209,13 +240,13 @@ inline B FloatingToNarrowUnsigned(A x) {
     constexpr A kHigh = static_cast<A>(std::numeric_limits<B>::max());
     constexpr A kCeiling = LargestConvertibleBelow<A, B>(kHigh);
     const A y = x + A(0.5);
-    A c = y > A(0) ? y : A(0);  // NaN takes 0 here
-    c = c < kCeiling ? c : kCeiling;
+    const A c = ClampMagnitude(y, kCeiling);
     if constexpr (sizeof(B) < 4) {
         return static_cast<B>(static_cast<std::int32_t>(c));
+    } else if constexpr (kCeiling == kHigh) {
+        return TruncateToUInt32(c);
     } else {
-        const std::uint32_t value = TruncateToUInt32(c);
-        return kCeiling == kHigh || !(y >= kHigh) ? value : std::numeric_limits<B>::max();
+        return y >= kHigh ? std::numeric_limits<B>::max() : TruncateToUInt32(c);
     }
 }
 
