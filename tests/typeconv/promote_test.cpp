@@ -11,6 +11,7 @@
 #include <functional>
 #include <limits>
 #include <memory>
+#include <ostream>
 #include <random>
 #include <string>
 #include <type_traits>
@@ -211,67 +212,31 @@ std::string Show(T value) {
 
 constexpr unsigned char kSentinel = 0xA5;
 constexpr std::size_t kGuard = 32;
-
-/// Output storage for `count` values of B followed by guard bytes, all sentinel.
-template <class B>
-struct GuardedOutput {
-    explicit GuardedOutput(std::size_t values)
-        : bytes(values * sizeof(B) + kGuard, kSentinel), count(values) {}
-    B At(std::size_t i) const {
-        B value;
-        std::memcpy(&value, bytes.data() + i * sizeof(B), sizeof value);
-        return value;
-    }
-    bool GuardIntact() const {
-        for (std::size_t i = count * sizeof(B); i < bytes.size(); ++i) {
-            if (bytes[i] != kSentinel) {
-                return false;
-            }
-        }
-        return true;
-    }
-    std::vector<unsigned char> bytes;
-    std::size_t count;
-};
-
 const std::size_t kLengths[] = {0, 1, 7, 8, 9, 17, 1003};
-
-/// Runs one family over `count` samples of `input` (cycled) and checks every value and the
-/// guard. `run` converts (src, dst, count).
-using Run = std::function<void(const void* src, void* dst, std::size_t count)>;
-
-template <class A, class B>
-void CheckFamily(SampleLayout layout, const std::vector<A>& values, std::size_t count,
-                 const Run& run, const std::string& where) {
-    const bool complexIn =
-        layout == SampleLayout::kComplex || layout == SampleLayout::kComplexToReal;
-    const bool complexOut =
-        layout == SampleLayout::kComplex || layout == SampleLayout::kRealToComplex;
-    std::vector<A> input((complexIn ? 2 : 1) * count);
-    for (std::size_t i = 0; i < input.size(); ++i) {
-        input[i] = values[(i * 7 + count) % values.size()];
-    }
-    GuardedOutput<B> output((complexOut ? 2 : 1) * count);
-    run(input.data(), output.bytes.data(), count);
-    ASSERT_TRUE(output.GuardIntact()) << where << ", count " << count;
-    for (std::size_t i = 0; i < count; ++i) {
-        const A real = input[complexIn ? 2 * i : i];
-        const B expected = Expected<B>(real);
-        ASSERT_TRUE(SameValue(output.At(complexOut ? 2 * i : i), expected))
-            << where << ", count " << count << ", sample " << i << ": " << Show(real) << " gave "
-            << Show(output.At(complexOut ? 2 * i : i)) << ", expected " << Show(expected);
-        if (layout == SampleLayout::kComplex) {
-            const B imaginary = Expected<B>(input[2 * i + 1]);
-            ASSERT_TRUE(SameValue(output.At(2 * i + 1), imaginary))
-                << where << ", imaginary part of " << Show(input[2 * i + 1]);
-        } else if (layout == SampleLayout::kRealToComplex) {
-            ASSERT_TRUE(SameValue(output.At(2 * i + 1), B(0))) << where << ", imaginary part";
-        }
-    }
-}
-
 const SampleLayout kLayouts[] = {SampleLayout::kReal, SampleLayout::kComplex,
                                  SampleLayout::kRealToComplex, SampleLayout::kComplexToReal};
+
+/// Compares one converted value with the reference: empty when equal, else a description.
+template <class A, class B>
+std::string Mismatch(const unsigned char* in, const unsigned char* out) {
+    A x;
+    B actual;
+    std::memcpy(&x, in, sizeof x);
+    std::memcpy(&actual, out, sizeof actual);
+    const B expected = Expected<B>(x);
+    if (SameValue(actual, expected)) {
+        return {};
+    }
+    return Show(x) + " gave " + Show(actual) + ", expected " + Show(expected);
+}
+
+template <class A>
+std::vector<unsigned char> InputBytes() {
+    const std::vector<A> values = Inputs<A>();
+    std::vector<unsigned char> bytes(values.size() * sizeof(A));
+    std::memcpy(bytes.data(), values.data(), bytes.size());
+    return bytes;
+}
 
 template <class A, class B>
 std::unique_ptr<typeconv::IPromote> NewFamily(SampleLayout layout) {
@@ -288,15 +253,66 @@ std::unique_ptr<typeconv::IPromote> NewFamily(SampleLayout layout) {
     return std::make_unique<typeconv::Complex2RealPromote<A, B>>();
 }
 
-template <class A, class B>
-void CheckPair() {
-    constexpr std::size_t kFrom = typeconv::detail::ComponentIndexOf<A>();
-    constexpr std::size_t kTo = typeconv::detail::ComponentIndexOf<B>();
-    const std::vector<A> values = Inputs<A>();
+/// What the checks need of a pair; only these few functions are instantiated per pair.
+struct Pair {
+    std::string name;
+    std::size_t from;
+    std::size_t to;
+    std::size_t fromSize;
+    std::size_t toSize;
+    std::vector<unsigned char> (*inputs)();
+    std::string (*mismatch)(const unsigned char* in, const unsigned char* out);
+    std::unique_ptr<typeconv::IPromote> (*newFamily)(SampleLayout layout);
+};
+
+void PrintTo(const Pair& pair, std::ostream* out) { *out << pair.name; }
+
+using Run = std::function<void(const void* src, void* dst, std::size_t count)>;
+
+/// Runs one family over `count` samples of the input values (cycled) and checks every
+/// value, the zero imaginary parts and the guard bytes after the output.
+void CheckFamily(const Pair& pair, SampleLayout layout, const std::vector<unsigned char>& values,
+                 std::size_t count, const Run& run, const std::string& where) {
+    const bool complexIn =
+        layout == SampleLayout::kComplex || layout == SampleLayout::kComplexToReal;
+    const bool complexOut =
+        layout == SampleLayout::kComplex || layout == SampleLayout::kRealToComplex;
+    const std::size_t valueCount = values.size() / pair.fromSize;
+    std::vector<unsigned char> input((complexIn ? 2 : 1) * count * pair.fromSize);
+    for (std::size_t i = 0; i < input.size() / pair.fromSize; ++i) {
+        std::memcpy(input.data() + i * pair.fromSize,
+                    values.data() + (i * 7 + count) % valueCount * pair.fromSize, pair.fromSize);
+    }
+    const std::size_t outBytes = (complexOut ? 2 : 1) * count * pair.toSize;
+    std::vector<unsigned char> output(outBytes + kGuard, kSentinel);
+    run(input.data(), output.data(), count);
+    ASSERT_EQ(std::vector<unsigned char>(output.begin() + static_cast<std::ptrdiff_t>(outBytes),
+                                         output.end()),
+              std::vector<unsigned char>(kGuard, kSentinel))
+        << where << ", count " << count;
+    const std::vector<unsigned char> zero(pair.toSize, 0);
+    for (std::size_t i = 0; i < count; ++i) {
+        const unsigned char* in = input.data() + (complexIn ? 2 : 1) * i * pair.fromSize;
+        const unsigned char* out = output.data() + (complexOut ? 2 : 1) * i * pair.toSize;
+        const std::string real = pair.mismatch(in, out);
+        ASSERT_TRUE(real.empty()) << where << ", count " << count << ", sample " << i << ": "
+                                  << real;
+        if (layout == SampleLayout::kComplex) {
+            const std::string imaginary = pair.mismatch(in + pair.fromSize, out + pair.toSize);
+            ASSERT_TRUE(imaginary.empty()) << where << ", imaginary part: " << imaginary;
+        } else if (layout == SampleLayout::kRealToComplex) {
+            ASSERT_EQ(std::memcmp(out + pair.toSize, zero.data(), pair.toSize), 0)
+                << where << ", imaginary part";
+        }
+    }
+}
+
+void CheckPair(const Pair& pair) {
+    const std::vector<unsigned char> values = pair.inputs();
     for (SampleLayout layout : kLayouts) {
         const std::string family = "layout " + std::to_string(static_cast<int>(layout));
         // Every variant this processor runs, over all the values at once and the lengths
-        // that reach vector bodies and tails; blocks of the complex layouts are crossed.
+        // that reach vector bodies and tails; 2500 samples cross the complex layouts' blocks.
         for (KernelVariant variant : {KernelVariant::kBaseline, KernelVariant::kAvx2}) {
             const KernelSet* kernels = typeconv::detail::FindKernels(variant);
             if (kernels == nullptr) {
@@ -305,25 +321,23 @@ void CheckPair() {
             const std::string where =
                 family + ", variant " + std::to_string(static_cast<int>(variant));
             const Run run = [&](const void* src, void* dst, std::size_t count) {
-                typeconv::detail::RunPromote(*kernels, layout, kFrom, kTo, src, dst, count);
+                typeconv::detail::RunPromote(*kernels, layout, pair.from, pair.to, src, dst, count);
             };
-            CheckFamily<A, B>(layout, values, values.size(), run, where);
-            CheckFamily<A, B>(layout, values, 2500, run, where);
+            CheckFamily(pair, layout, values, values.size() / pair.fromSize, run, where);
+            CheckFamily(pair, layout, values, 2500, run, where);
             for (std::size_t count : kLengths) {
-                CheckFamily<A, B>(layout, values, count, run, where);
+                CheckFamily(pair, layout, values, count, run, where);
             }
         }
         // The class, through its interface.
-        const std::unique_ptr<typeconv::IPromote> promote = NewFamily<A, B>(layout);
-        EXPECT_EQ(promote->GetInputBits(), sizeof(A) * 8);
-        EXPECT_EQ(promote->GetOutputBits(), sizeof(B) * 8);
+        const std::unique_ptr<typeconv::IPromote> promote = pair.newFamily(layout);
+        EXPECT_EQ(promote->GetInputBits(), pair.fromSize * 8);
+        EXPECT_EQ(promote->GetOutputBits(), pair.toSize * 8);
+        const Run run = [&](const void* src, void* dst, std::size_t count) {
+            promote->Promote(src, dst, static_cast<unsigned int>(count));
+        };
         for (std::size_t count : kLengths) {
-            CheckFamily<A, B>(
-                layout, values, count,
-                [&](const void* src, void* dst, std::size_t n) {
-                    promote->Promote(src, dst, static_cast<unsigned int>(n));
-                },
-                family + ", class");
+            CheckFamily(pair, layout, values, count, run, family + ", class");
         }
     }
 }
@@ -331,25 +345,29 @@ void CheckPair() {
 // ------------------------------------------------------------------ the 100 pairs
 
 template <class T>
-const char* Name() {
+std::string Name() {
     if constexpr (std::is_floating_point_v<T>) {
         return sizeof(T) == 4 ? "Float32" : "Float64";
     } else {
-        static const std::string name =
-            std::string(std::is_signed_v<T> ? "Int" : "UInt") + std::to_string(sizeof(T) * 8);
-        return name.c_str();
+        return std::string(std::is_signed_v<T> ? "Int" : "UInt") + std::to_string(sizeof(T) * 8);
     }
 }
 
-struct Pair {
-    std::string name;
-    void (*check)();
-};
+template <class A, class B>
+Pair MakePair() {
+    return {Name<A>() + "_" + Name<B>(),
+            typeconv::detail::ComponentIndexOf<A>(),
+            typeconv::detail::ComponentIndexOf<B>(),
+            sizeof(A),
+            sizeof(B),
+            &InputBytes<A>,
+            &Mismatch<A, B>,
+            &NewFamily<A, B>};
+}
 
 std::vector<Pair> AllPairs() {
     std::vector<Pair> pairs;
-#define KUBO_TEST_PAIR(A, B) \
-    pairs.push_back({std::string(Name<A>()) + "_" + Name<B>(), &CheckPair<A, B>});
+#define KUBO_TEST_PAIR(A, B) pairs.push_back(MakePair<A, B>());
     KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_TEST_PAIR)
 #undef KUBO_TEST_PAIR
     return pairs;
@@ -357,7 +375,7 @@ std::vector<Pair> AllPairs() {
 
 class EveryPair : public testing::TestWithParam<Pair> {};
 
-TEST_P(EveryPair, FollowsTheRuleInEveryFamilyAndVariant) { GetParam().check(); }
+TEST_P(EveryPair, FollowsTheRuleInEveryFamilyAndVariant) { CheckPair(GetParam()); }
 
 INSTANTIATE_TEST_SUITE_P(Promote, EveryPair, testing::ValuesIn(AllPairs()),
                          [](const testing::TestParamInfo<Pair>& pair) { return pair.param.name; });

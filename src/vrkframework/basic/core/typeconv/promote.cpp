@@ -23,28 +23,25 @@ constexpr char kSourcePath[] = "vrkframework/basic/core/typeconv/promote";
 constexpr char kTooWide[] =
     "Invalid type promote, the number of bit is bigger than the type requested for conversion";
 
-std::string Signature(unsigned int bits, const char* typeName, const char* kernel,
-                      const std::string& parameters) {
-    return "void __cdecl typeconv::BitDepthPromote<" + std::to_string(bits) + "," + typeName +
-           ",0,0>::" + kernel + "(" + parameters + ")";
+/// Throws the failure of BitDepthPromote<bits, typeName, 0, 0>::kernel(parameters).
+[[noreturn]] void ThrowTooWide(unsigned int bits, const char* typeName, const char* kernel,
+                               const std::string& parameters, unsigned int line) {
+    throw kora::Exception(kTooWide, kSourcePath,
+                          "void __cdecl typeconv::BitDepthPromote<" + std::to_string(bits) + "," +
+                              typeName + ",0,0>::" + kernel + "(" + parameters + ")",
+                          line);
 }
 
 }  // namespace
 
 void ThrowUnpackBitsTooWide(unsigned int bits, const char* typeName) {
-    throw kora::Exception(
-        kTooWide, kSourcePath,
-        Signature(bits, typeName, "Promote",
-                  std::string("const unsigned char *,") + typeName + " *,unsigned int"),
-        390);
+    ThrowTooWide(bits, typeName, "Promote",
+                 std::string("const unsigned char *,") + typeName + " *,unsigned int", 390);
 }
 
 void ThrowPackBitsTooWide(unsigned int bits, const char* typeName) {
-    throw kora::Exception(
-        kTooWide, kSourcePath,
-        Signature(bits, typeName, "Pack",
-                  std::string("const ") + typeName + " *,unsigned char *,unsigned int"),
-        395);
+    ThrowTooWide(bits, typeName, "Pack",
+                 std::string("const ") + typeName + " *,unsigned char *,unsigned int", 395);
 }
 
 }  // namespace detail
