@@ -24,7 +24,7 @@ Range NaturalRange(const DataType& type) {
     }
     if (type.isFloat) {
         if (type.bits <= 32) {
-            constexpr double kFloatMax = std::numeric_limits<float>::max();
+            constexpr auto kFloatMax = static_cast<double>(std::numeric_limits<float>::max());
             return {-kFloatMax, kFloatMax, std::pow(2.0, -23.0)};
         }
         constexpr double kDoubleMax = std::numeric_limits<double>::max();
