@@ -30,8 +30,11 @@ std::unique_ptr<typeconv::IPromote> Create(const DataType& from, const DataType&
 template <class Expected>
 bool Creates(const DataType& from, const DataType& to) {
     const std::unique_ptr<typeconv::IPromote> promote = Create(from, to);
-    return promote && typeid(*promote) == typeid(Expected) &&
-           dynamic_cast<Expected*>(promote.get()) != nullptr;
+    if (!promote) {
+        return false;
+    }
+    const typeconv::IPromote& object = *promote;
+    return typeid(object) == typeid(Expected) && dynamic_cast<Expected*>(promote.get()) != nullptr;
 }
 
 DataType Packed(unsigned int bits) { return DataType(bits, false, false, bits, 0, false); }
@@ -125,8 +128,9 @@ TEST(PromoteFactory, PackedSideWithAComplexOrUnknownWholeSideThrows) {
         {DataType::TypeC8U, Packed(4)},
         {Packed(12), DataType(24, false, false, 24, 0, false)},
     };
-    for (const auto& [from, to] : pairs) {
-        const auto failure = kubo_test::Catch<kora::Exception>([&] { Create(from, to); });
+    for (const auto& pair : pairs) {
+        const auto failure =
+            kubo_test::Catch<kora::Exception>([&] { Create(pair.first, pair.second); });
         ASSERT_TRUE(failure);
         EXPECT_EQ(failure->GetMessage(), "Invalid type requested.");
         EXPECT_EQ(failure->GetSourceFile(),

@@ -55,27 +55,40 @@ B NaNResult() {
     }
 }
 
+// x < y for integers of any two types, by value.
+template <class X, class Y>
+bool Less(X x, Y y) {
+    if constexpr (std::is_signed_v<X> == std::is_signed_v<Y>) {
+        return x < y;
+    } else if constexpr (std::is_signed_v<X>) {
+        return x < 0 || static_cast<std::uint64_t>(x) < static_cast<std::uint64_t>(y);
+    } else {
+        return y > 0 && static_cast<std::uint64_t>(x) < static_cast<std::uint64_t>(y);
+    }
+}
+
 template <class B, class A>
 B ExpectedFromInteger(A x) {
-    const long double v = static_cast<long double>(x);  // exact for every 64-bit value
+    constexpr B kMax = std::numeric_limits<B>::max();
+    constexpr B kMin = std::numeric_limits<B>::lowest();
     if constexpr (std::is_floating_point_v<B>) {
-        return static_cast<B>(v);  // one rounding to the nearest value
+        return static_cast<B>(x);  // the ordinary conversion: the nearest value
     } else if constexpr (std::is_same_v<A, std::int64_t>) {
         if constexpr (std::is_same_v<B, std::uint64_t>) {
             return static_cast<B>(x);  // bit copy
         } else {
-            return v >= High<B>() ? std::numeric_limits<B>::max() : static_cast<B>(x);  // wraps
+            return Less(x, kMax) ? static_cast<B>(x) : kMax;  // below the maximum: wraps
         }
     } else if constexpr (std::is_same_v<A, std::uint64_t>) {
-        return v > High<B>() ? std::numeric_limits<B>::max() : static_cast<B>(x);
+        return Less(kMax, x) ? kMax : static_cast<B>(x);
     } else if constexpr (kSmallSigned<A> && sizeof(B) == 8) {
-        return v < 1 ? B(0) : static_cast<B>(x);
+        return x < 1 ? B(0) : static_cast<B>(x);
     } else {
-        if (v > High<B>()) {
-            return std::numeric_limits<B>::max();
+        if (Less(kMax, x)) {
+            return kMax;
         }
-        if (v < Low<B>()) {
-            return std::numeric_limits<B>::lowest();
+        if (Less(x, kMin)) {
+            return kMin;
         }
         return static_cast<B>(x);
     }
@@ -89,7 +102,7 @@ B ExpectedFromFloating(A x) {
         if (std::isnan(x)) {
             return NaNResult<B>();
         }
-        const long double v = x;
+        const long double v = static_cast<long double>(x);
         if constexpr (sizeof(B) == 8) {
             const long double high = std::is_signed_v<B> ? 0x1p63L : 0x1p64L;
             if (v <= 0) {
@@ -103,8 +116,9 @@ B ExpectedFromFloating(A x) {
             // y = x + 0.5 (or x - 0.5 for signed destinations below 0), one rounding to
             // A; the thresholds are B's limits as values of A.
             const long double half = std::is_signed_v<B> && v < 0 ? -0.5L : 0.5L;
-            const long double y = static_cast<A>(v + half);
-            const long double high = static_cast<A>(std::numeric_limits<B>::max());
+            const long double y = static_cast<long double>(static_cast<A>(v + half));
+            const long double high =
+                static_cast<long double>(static_cast<A>(std::numeric_limits<B>::max()));
             if (y >= high) {
                 return std::numeric_limits<B>::max();
             }
