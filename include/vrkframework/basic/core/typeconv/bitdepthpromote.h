@@ -47,12 +47,12 @@ struct KUBO_API BitDepthPromote<N, T, 0, 0> {
     KUBO_DETAIL_PACKED_BIT_COUNTS(X, std::int64_t)   \
     KUBO_DETAIL_PACKED_BIT_COUNTS(X, std::uint64_t)
 
-#define KUBO_DETAIL_PACKED_BIT_COUNTS(X, T)                                                       \
-    X(1, T)                                                                                       \
-    X(2, T)                                                                                       \
-    X(3, T) X(4, T) X(5, T) X(6, T) X(7, T) X(9, T) X(10, T) X(11, T) X(12, T) X(13, T) X(14, T)  \
-        X(15, T) X(17, T) X(18, T) X(19, T) X(20, T) X(21, T) X(22, T) X(23, T) X(24, T) X(25, T) \
-            X(26, T) X(27, T) X(28, T) X(29, T) X(30, T) X(31, T)
+// clang-format off
+#define KUBO_DETAIL_PACKED_BIT_COUNTS(X, T)                                                    \
+    X(1, T) X(2, T) X(3, T) X(4, T) X(5, T) X(6, T) X(7, T) X(9, T) X(10, T) X(11, T) X(12, T) \
+    X(13, T) X(14, T) X(15, T) X(17, T) X(18, T) X(19, T) X(20, T) X(21, T) X(22, T)         \
+    X(23, T) X(24, T) X(25, T) X(26, T) X(27, T) X(28, T) X(29, T) X(30, T) X(31, T)
+// clang-format on
 
 namespace typeconv {
 #define KUBO_DETAIL_EXTERN_BIT_DEPTH(N, T) \
