@@ -2,6 +2,15 @@
 #ifndef VRKFRAMEWORK_BASIC_KUBO_KUBO_H
 #define VRKFRAMEWORK_BASIC_KUBO_KUBO_H
 
+#include "vrkframework/basic/core/typeconv/bitdepthpromote.h"
+#include "vrkframework/basic/core/typeconv/complex2realpromote.h"
+#include "vrkframework/basic/core/typeconv/complexpromote.h"
+#include "vrkframework/basic/core/typeconv/componentpairs.h"
+#include "vrkframework/basic/core/typeconv/ipromote.h"
+#include "vrkframework/basic/core/typeconv/promote.h"
+#include "vrkframework/basic/core/typeconv/promoteoperations.h"
+#include "vrkframework/basic/core/typeconv/real2complexpromote.h"
+#include "vrkframework/basic/core/typeconv/specialpromote.h"
 #include "vrkframework/basic/core/typeconv/typelist.h"
 #include "vrkframework/basic/core/typedispatch/extendtypedispatch.h"
 #include "vrkframework/basic/kubo/controlpoints/controlpoint.h"
@@ -17,9 +26,11 @@
 #include "vrkframework/basic/kubo/raster/complexrasterinterpretation.h"
 #include "vrkframework/basic/kubo/raster/datatype.h"
 #include "vrkframework/basic/kubo/raster/datatypeconstraints.h"
+#include "vrkframework/basic/kubo/raster/ipromotefactory.h"
 #include "vrkframework/basic/kubo/raster/irasterinterpretation.h"
 #include "vrkframework/basic/kubo/raster/marginfiller.h"
 #include "vrkframework/basic/kubo/raster/nativedatatype.h"
+#include "vrkframework/basic/kubo/raster/promotefactory.h"
 #include "vrkframework/basic/kubo/raster/raster.h"
 #include "vrkframework/basic/kubo/raster/rastercontext.h"
 #include "vrkframework/basic/kubo/raster/rasterinfo.h"
