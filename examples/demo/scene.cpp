@@ -30,8 +30,7 @@ double ValueNoise(double x, double y, std::uint32_t seed) {
     const auto iy = static_cast<std::uint32_t>(static_cast<std::int64_t>(fy));
     const double tx = Smooth(x - fx);
     const double ty = Smooth(y - fy);
-    const double top =
-        Unit(Hash(ix, iy, seed)) * (1 - tx) + Unit(Hash(ix + 1, iy, seed)) * tx;
+    const double top = Unit(Hash(ix, iy, seed)) * (1 - tx) + Unit(Hash(ix + 1, iy, seed)) * tx;
     const double bottom =
         Unit(Hash(ix, iy + 1, seed)) * (1 - tx) + Unit(Hash(ix + 1, iy + 1, seed)) * tx;
     return top * (1 - ty) + bottom * ty;
