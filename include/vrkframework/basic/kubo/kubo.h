@@ -3,6 +3,14 @@
 #define VRKFRAMEWORK_BASIC_KUBO_KUBO_H
 
 #include "vrkframework/basic/kubo/kuboapi.h"
+#include "vrkframework/basic/kubo/masks/bkgdrule.h"
+#include "vrkframework/basic/kubo/masks/coordinatemaskbuilder.h"
+#include "vrkframework/basic/kubo/masks/imaskbuilder.h"
+#include "vrkframework/basic/kubo/masks/imaskdecision.h"
+#include "vrkframework/basic/kubo/masks/imaskdecisionimpl.h"
+#include "vrkframework/basic/kubo/masks/mask.h"
+#include "vrkframework/basic/kubo/masks/maskdecision.h"
+#include "vrkframework/basic/kubo/masks/maskdecisionbuilder.h"
 #include "vrkframework/basic/kubo/raster/datatype.h"
 #include "vrkframework/basic/kubo/raster/datatypeconstraints.h"
 #include "vrkframework/basic/kubo/raster/nativedatatype.h"
