@@ -12,7 +12,6 @@
 
 namespace {
 
-using kora::kubo::BkgdRule;
 using kora::kubo::DataType;
 using kora::kubo::Mask;
 using kora::kubo::MaskDecisionBuilder;

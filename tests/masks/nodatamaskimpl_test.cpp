@@ -24,6 +24,8 @@ using kora::kubo::IMaskDecisionImpl;
 using kora::kubo::detail::WiderType;
 using Kernel = std::unique_ptr<IMaskDecisionImpl>;
 
+const std::type_info& ClassOf(const IMaskDecisionImpl* kernel) { return typeid(*kernel); }
+
 template <class T>
 DataType TypeOf() {
     if constexpr (std::is_floating_point_v<T>) {
@@ -122,10 +124,10 @@ template <class K, class T>
 void ExpectKernel(IMaskDecisionImpl* made, BkgdRule rule, const std::vector<Channel>& channels) {
     Kernel owned(made);
     auto* kernel = dynamic_cast<K*>(made);
-    ASSERT_NE(kernel, nullptr) << typeid(*made).name();
+    ASSERT_NE(kernel, nullptr) << ClassOf(made).name();
     ExpectFlags<T>(*made, rule, channels);
     Kernel clone(made->Clone());
-    EXPECT_EQ(typeid(*clone), typeid(*made));
+    EXPECT_EQ(ClassOf(clone.get()), ClassOf(made));
     ExpectFlags<T>(*clone, rule, channels);
     K baseline(*kernel);
     ExpectFlags<T>(baseline, rule, channels);
@@ -290,17 +292,18 @@ TYPED_TEST(NoDataKernels, TaggedEntriesHonourAllFourTags) {
 
 TEST(GetMaskDecisionImpl, DiffKernelsAreTheReassignedSigned8BitInstances) {
     Kernel any(GetMaskDecisionImpl(DataType::Type16U, 3, BkgdAnyChan, {1}, {2}));
-    EXPECT_EQ(typeid(*any),
+    EXPECT_EQ(ClassOf(any.get()),
               typeid(DiffNoDataAnyChanMaskImpl<char, 1, short>::Reassign<unsigned short>));
     EXPECT_NE(
         (dynamic_cast<DiffNoDataAnyChanMaskImpl<unsigned short, 1, unsigned int>*>(any.get())),
         nullptr);
     Kernel all(GetMaskDecisionImpl(DataType::Type64R, 2, BkgdAllChans, {1, 2}, {1, 2}));
-    EXPECT_EQ(typeid(*all), typeid(DiffNoDataAllChansMaskImpl<char, 0>::Reassign<double>));
+    EXPECT_EQ(ClassOf(all.get()), typeid(DiffNoDataAllChansMaskImpl<char, 0>::Reassign<double>));
     Kernel pairs(GetMaskDecisionImpl(DataType::Type8S, 4, BkgdChanPairs, {1, 2}, {1, 2}));
-    EXPECT_EQ(typeid(*pairs), typeid(DiffNoDataChanPairsMaskImpl<char, 1, short>::Reassign<char>));
+    EXPECT_EQ(ClassOf(pairs.get()),
+              typeid(DiffNoDataChanPairsMaskImpl<char, 1, short>::Reassign<char>));
     Kernel clone(pairs->Clone());
-    EXPECT_EQ(typeid(*clone), typeid(*pairs));
+    EXPECT_EQ(ClassOf(clone.get()), ClassOf(pairs.get()));
 }
 
 TEST(GetMaskDecisionImpl, UnknownTypesAndRulesYieldNull) {
@@ -391,7 +394,7 @@ TEST(GetMaskDecisionImpl, ComplexTypesAreTestedByTheirComponentType) {
         // No-data 0 leaves the pair (0, 0): one shared value.
         Kernel kernel(GetMaskDecisionImpl(c.complex, 2, BkgdAllChans, {0, 0}, {1, 2}));
         ASSERT_NE(kernel, nullptr);
-        EXPECT_EQ(typeid(*kernel), c.kernel);
+        EXPECT_EQ(ClassOf(kernel.get()), c.kernel);
     }
 }
 
@@ -430,14 +433,6 @@ TEST(GetMaskDecisionImpl, NoDataValuesAreStoredByTruncationKeepingLowBits) {
     EXPECT_EQ(Stored<float>(DataType::Type32R, 1e39), std::numeric_limits<float>::infinity());
     EXPECT_EQ(Stored<float>(DataType::Type32R, -3.4028235e38), -3.4028235e38f);
     EXPECT_EQ(Stored<double>(DataType::Type64R, 0.1), 0.1);
-}
-
-TEST(GetMaskDecisionImpl, UnsignedByteMinusOneMatchesSamplesOf255) {
-    const unsigned char samples[3] = {255, 254, 0};
-    unsigned char flags[3] = {};
-    Kernel kernel(GetMaskDecisionImpl(DataType::Type8U, 1, BkgdAllChans, {-1.0}, {1}));
-    kernel->Evaluate(samples, flags, 3);
-    EXPECT_EQ(std::vector<unsigned char>(flags, flags + 3), (std::vector<unsigned char>{0, 1, 1}));
 }
 
 // Listed 32-bit float channels compare the double value with each sample widened to double,
@@ -491,6 +486,9 @@ TEST(GetMaskDecisionImpl, ChannelsOfTheDocumentedExamples) {
     EXPECT_EQ(flagOf(*all, {0, 0, 0}), 0);
     Kernel any(GetMaskDecisionImpl(DataType::Type8U, 3, BkgdAnyChan, {0, 0, 0}, {1, 2, 3}));
     EXPECT_EQ(flagOf(*any, {0, 5, 7}), 0);
+    Kernel minusOne(GetMaskDecisionImpl(DataType::Type8U, 1, BkgdAllChans, {-1.0}, {1}));
+    EXPECT_EQ(flagOf(*minusOne, {255}), 0);
+    EXPECT_EQ(flagOf(*minusOne, {254}), 1);
     for (const BkgdRule rule : {BkgdAllChans, BkgdAnyChan}) {
         Kernel listed(GetMaskDecisionImpl(DataType::Type8U, 3, rule, {9}, {2}));
         EXPECT_EQ(flagOf(*listed, {1, 9, 1}), 0);

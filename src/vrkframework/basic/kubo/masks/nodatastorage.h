@@ -3,7 +3,6 @@
 #ifndef VRKFRAMEWORK_BASIC_KUBO_MASKS_NODATASTORAGE_H
 #define VRKFRAMEWORK_BASIC_KUBO_MASKS_NODATASTORAGE_H
 
-#include <cmath>    // std::fabs, std::isinf
 #include <cstdint>  // std::int64_t, std::uint64_t
 #include <limits>
 #include <type_traits>
@@ -90,19 +89,9 @@ inline std::uint64_t TruncatedBits(double v) {
     return static_cast<std::uint64_t>(kTwo63);
 }
 
-/// `v` rounded to the nearest float. Beyond the float range the conversion is spelled out,
-/// so it stays defined: from halfway between the largest float and 2^128 on, it is infinite.
-inline float RoundToFloat(double v) {
-    constexpr double kInfinityFrom = 340282356779733661637539395458142568448.0;  // 2^128 - 2^103
-    if (std::fabs(v) >= kInfinityFrom && !std::isinf(v)) {
-        return v > 0 ? std::numeric_limits<float>::infinity()
-                     : -std::numeric_limits<float>::infinity();
-    }
-    return static_cast<float>(v);
-}
-
 /// A no-data value in storage type S: integers keep the low bits of the truncated value
-/// (-1.0 is 255 for unsigned 8-bit), float rounds, double is kept. Nothing is clamped.
+/// (-1.0 is 255 for unsigned 8-bit), float rounds to nearest (to infinity beyond its range),
+/// double is kept. Nothing is clamped.
 template <class S>
 S ToStorage(double v) {
     if constexpr (IsOneMoreBit<S>::value) {
@@ -110,7 +99,8 @@ S ToStorage(double v) {
     } else if constexpr (std::is_same_v<S, double>) {
         return v;
     } else if constexpr (std::is_same_v<S, float>) {
-        return RoundToFloat(v);
+        static_assert(std::numeric_limits<float>::is_iec559, "every double lies between floats");
+        return static_cast<float>(v);
     } else {
         static_assert(std::is_integral_v<S>, "no-data storage is integer, float or tagged");
         return static_cast<S>(TruncatedBits(v));
@@ -155,9 +145,7 @@ auto TestOf(const S& entry) {
         bool isValue = false;
         T value = 0;
         if constexpr (std::is_floating_point_v<T>) {
-            isValue = std::isinf(entry) ||
-                      (std::fabs(entry) <= static_cast<S>(std::numeric_limits<T>::max()) &&
-                       static_cast<S>(static_cast<T>(entry)) == entry);
+            isValue = static_cast<S>(static_cast<T>(entry)) == entry;
         } else if constexpr (std::is_signed_v<T>) {
             isValue = entry >= static_cast<S>(std::numeric_limits<T>::min()) &&
                       entry <= static_cast<S>(std::numeric_limits<T>::max());

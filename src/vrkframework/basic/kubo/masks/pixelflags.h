@@ -52,7 +52,8 @@ KUBO_CLONED_TEMPLATE void FlagFixedStride(const T* __restrict samples,
         bool valid = Rule != BkgdAllChans;
         if constexpr (Rule == BkgdAllChans) {
             for (std::size_t k = 0; k < C; ++k) {
-                valid |= tests[k].IsTested() & !tests[k].Matches(pixel[k]);
+                const bool differs = !tests[k].Matches(pixel[k]);
+                valid |= tests[k].IsTested() & differs;
             }
         } else if constexpr (Rule == BkgdAnyChan) {
             for (std::size_t k = 0; k < C; ++k) {
@@ -60,7 +61,9 @@ KUBO_CLONED_TEMPLATE void FlagFixedStride(const T* __restrict samples,
             }
         } else {
             for (std::size_t k = 0; k + 1 < C; k += 2) {
-                valid &= !(tests[k].Matches(pixel[k]) & tests[k + 1].Matches(pixel[k + 1]));
+                const bool first = tests[k].Matches(pixel[k]);
+                const bool second = tests[k + 1].Matches(pixel[k + 1]);
+                valid &= !(first & second);
             }
         }
         flags[i] = valid;
