@@ -1,0 +1,14 @@
+// The complex to complex conversions of every pair of component types.
+#include "vrkframework/basic/core/typeconv/complexpromote.h"
+
+#include "vrkframework/basic/core/typeconv/promoteoperations_impl.h"
+
+namespace typeconv {
+
+#define KUBO_DETAIL_INSTANTIATE_FAMILY(A, B)                                        \
+    template class detail::PromoteOperations<A, B, detail::SampleLayout::kComplex>; \
+    template class ComplexPromote<A, B>;
+KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_DETAIL_INSTANTIATE_FAMILY)
+#undef KUBO_DETAIL_INSTANTIATE_FAMILY
+
+}  // namespace typeconv

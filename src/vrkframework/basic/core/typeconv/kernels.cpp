@@ -1,0 +1,83 @@
+// The choice of the kernel table and the drivers of the complex layouts.
+#include "vrkframework/basic/core/typeconv/kernels.h"
+
+#include <cstdint>
+
+namespace typeconv::detail {
+namespace {
+
+constexpr std::size_t kSizeOf[kComponentCount] = {1, 1, 2, 2, 4, 4, 4, 8, 8, 8};
+
+constexpr std::size_t Log2(std::size_t size) {
+    return size == 1 ? 0 : size == 2 ? 1 : size == 4 ? 2 : 3;
+}
+
+/// The complex layouts with one component side convert through a small block that stays
+/// in the first-level cache: contiguous conversion, then (de)interleaving, so every pair
+/// shares the contiguous kernels.
+constexpr std::size_t kBlockBytes = 8192;
+
+bool ProcessorHasAvx2() {
+#if defined(KUBO_HAVE_AVX2_KERNELS)
+    return __builtin_cpu_supports("avx2") != 0;
+#else
+    return false;
+#endif
+}
+
+}  // namespace
+
+const KernelSet* FindKernels(KernelVariant variant) {
+    switch (variant) {
+        case KernelVariant::kBaseline:
+            return &BaselineKernelSet();
+        case KernelVariant::kAvx2:
+#if defined(KUBO_HAVE_AVX2_KERNELS)
+            return ProcessorHasAvx2() ? &Avx2KernelSet() : nullptr;
+#else
+            return nullptr;
+#endif
+    }
+    return nullptr;
+}
+
+const KernelSet& ActiveKernels() {
+    static const KernelSet& active =
+        ProcessorHasAvx2() ? *FindKernels(KernelVariant::kAvx2) : BaselineKernelSet();
+    return active;
+}
+
+void RunPromote(const KernelSet& kernels, SampleLayout layout, std::size_t from, std::size_t to,
+                const void* src, void* dst, std::size_t count) {
+    const ConvertKernel convert = kernels.convert[from][to];
+    switch (layout) {
+        case SampleLayout::kReal:
+            convert(src, dst, count);
+            return;
+        case SampleLayout::kComplex:
+            convert(src, dst, 2 * count);
+            return;
+        case SampleLayout::kRealToComplex:
+        case SampleLayout::kComplexToReal:
+            break;
+    }
+    const bool toComplex = layout == SampleLayout::kRealToComplex;
+    const std::size_t fromSize = kSizeOf[from];
+    const std::size_t toSize = kSizeOf[to];
+    const std::size_t blockCount = kBlockBytes / (toComplex ? toSize : fromSize);
+    alignas(64) unsigned char block[kBlockBytes];
+    const auto* in = static_cast<const unsigned char*>(src);
+    auto* out = static_cast<unsigned char*>(dst);
+    for (std::size_t done = 0; done < count; done += blockCount) {
+        const std::size_t n = count - done < blockCount ? count - done : blockCount;
+        if (toComplex) {
+            convert(in + done * fromSize, block, n);
+            kernels.interleaveWithZeros[Log2(toSize)](block, out + 2 * done * toSize, n);
+        } else {
+            kernels.takeRealParts[Log2(fromSize)](in + 2 * done * fromSize, block, n);
+            convert(block, out + done * toSize, n);
+        }
+    }
+}
+
+}  // namespace typeconv::detail

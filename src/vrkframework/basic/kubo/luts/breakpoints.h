@@ -1,0 +1,91 @@
+// Breakpoint rules shared by the lookup and pseudocolour tables: their order and the search
+// for an input that has no breakpoint of its own.
+#ifndef VRKFRAMEWORK_BASIC_KUBO_LUTS_BREAKPOINTS_H
+#define VRKFRAMEWORK_BASIC_KUBO_LUTS_BREAKPOINTS_H
+
+#include <algorithm>  // std::is_sorted, std::sort
+#include <cmath>      // std::isnan
+#include <cstddef>    // std::size_t
+#include <vector>
+
+namespace kora::kubo::detail {
+
+/// Breakpoints of a classic 8-bit table, whose inputs are 0 to 255.
+constexpr std::size_t kClassicEntryCount = 256;
+
+/// The entries of a classic table: entry i is (i, values[i]) for i from 0 to 255.
+template <class Entry, class Source>
+std::vector<Entry> ClassicEntries(const Source* values) {
+    std::vector<Entry> entries(kClassicEntryCount);
+    for (std::size_t i = 0; i < kClassicEntryCount; ++i) {
+        entries[i] = {static_cast<double>(i), values[i]};
+    }
+    return entries;
+}
+
+/// Sorts (input, value) entries by input unless no neighbour pair is out of order.
+template <class Entry>
+void SortByInput(std::vector<Entry>& entries) {
+    const auto byInput = [](const Entry& a, const Entry& b) { return a.first < b.first; };
+    if (std::is_sorted(entries.begin(), entries.end(), byInput)) {
+        return;
+    }
+    // NaN is unordered against everything, which is no strict weak order and may send the
+    // sort out of bounds; ranking NaN after every number restores one.
+    std::sort(entries.begin(), entries.end(), [](const Entry& a, const Entry& b) {
+        return a.first < b.first || (std::isnan(b.first) && !std::isnan(a.first));
+    });
+}
+
+/// True when there are 256 entries whose inputs are 0 to 255 in order.
+template <class Entry>
+bool HasClassicInputs(const std::vector<Entry>& entries) {
+    if (entries.size() != kClassicEntryCount) {
+        return false;
+    }
+    for (std::size_t i = 0; i < kClassicEntryCount; ++i) {
+        if (entries[i].first != static_cast<double>(i)) {
+            return false;
+        }
+    }
+    return true;
+}
+
+/// Index of the first of `count` (at least 1) entries whose input is not below `x`, or
+/// `count` when there is none. The halving steps compile to conditional moves, so random
+/// inputs cost no mispredicted branches; NaN is below nothing and yields 0.
+template <class Entry>
+std::size_t LowerBound(const Entry* entries, std::size_t count, double x) {
+    const Entry* first = entries;
+    // The answer stays within [first, first + count]; each step keeps the half holding it.
+    while (count > 1) {
+        const std::size_t half = count / 2;
+        first = first[half].first < x ? first + half : first;
+        count -= half;
+    }
+    return static_cast<std::size_t>(first - entries) + static_cast<std::size_t>(first->first < x);
+}
+
+/// Where an input falls among the entries: `index` is the entry whose value answers as it
+/// stands, or, when `between` is set, the upper of the two entries to interpolate.
+struct Bracket {
+    std::size_t index;
+    bool between;
+};
+
+/// Places `x` among sorted entries (at least 1) once the direct index has missed: past the
+/// last input the last entry answers, at or below the first (or NaN) the first, an equal
+/// input its first entry; otherwise `x` lies between `index - 1` and `index`.
+template <class Entry>
+Bracket Search(const std::vector<Entry>& entries, double x) {
+    const std::size_t count = entries.size();
+    const std::size_t upper = LowerBound(entries.data(), count, x);
+    if (upper == count) {
+        return {count - 1, false};
+    }
+    return {upper, upper != 0 && entries[upper].first != x};
+}
+
+}  // namespace kora::kubo::detail
+
+#endif  // VRKFRAMEWORK_BASIC_KUBO_LUTS_BREAKPOINTS_H

@@ -1,0 +1,106 @@
+// Pseudocolour table construction, lookup and the classic-table test.
+#include "vrkframework/basic/kubo/luts/pct.h"
+
+#include <array>
+#include <cstdint>  // std::uint32_t
+
+#include "vrkframework/basic/kubo/luts/breakpoints.h"
+#include "vrkframework/platform/exception.h"
+#include "vrkframework/platform/formatstring.h"
+
+namespace kora::kubo {
+namespace {
+
+constexpr char kSourcePath[] = "vrkframework/basic/kubo/luts/pct";
+
+// The colours of a classic table, once their count is checked.
+const PCT::Colour* ClassicColours(const std::vector<PCT::Colour>& colours) {
+    if (colours.size() != detail::kClassicEntryCount) {
+        throw kora::DataException(kora::FormatString("PCT must have 256 entries, %d given.",
+                                                     static_cast<int>(colours.size())),
+                                  kSourcePath,
+                                  "__cdecl kora::kubo::PCT::PCT(const class std::vector<struct "
+                                  "kora::kubo::RGBTuple<unsigned char>,class std::allocator<struct "
+                                  "kora::kubo::RGBTuple<unsigned char> > > &)",
+                                  54);
+    }
+    return colours.data();
+}
+
+std::vector<PCT::Colour> InterleavePlanes(const unsigned char* planes) {
+    constexpr std::size_t kPlane = detail::kClassicEntryCount;
+    std::vector<PCT::Colour> colours(kPlane);
+    for (std::size_t i = 0; i < kPlane; ++i) {
+        colours[i] = {planes[i], planes[kPlane + i], planes[2 * kPlane + i]};
+    }
+    return colours;
+}
+
+// Bytes as doubles. Reading them from a table is cheaper than converting, which would
+// compete with the three truncations of a blend for the same conversion units.
+constexpr auto kByteValues = [] {
+    std::array<double, 256> values{};
+    for (std::size_t i = 0; i < values.size(); ++i) {
+        values[i] = static_cast<double>(i);
+    }
+    return values;
+}();
+
+// (upper - lower) x t + lower: the difference of two whole doubles is the exact signed
+// difference, so a falling component comes out right. With t in [0, 1] the result lies
+// between the two components, so it truncates to a byte value without any masking.
+std::uint32_t Blend(unsigned char lower, unsigned char upper, double t) {
+    const double from = kByteValues[lower];
+    return static_cast<std::uint32_t>(static_cast<int>((kByteValues[upper] - from) * t + from));
+}
+
+// The colour travels as red | green << 8 | blue << 16: an integer is returned in a register,
+// where a three-byte struct gets assembled in memory and reloaded at a store-forwarding stall.
+std::uint32_t Pack(std::uint32_t r, std::uint32_t g, std::uint32_t b) {
+    return r | g << 8 | b << 16;
+}
+
+std::uint32_t Pack(const PCT::Colour& colour) { return Pack(colour.r, colour.g, colour.b); }
+
+}  // namespace
+
+PCT::PCT(const std::vector<Colour>& colours)
+    : BreakpointTable(detail::ClassicEntries<Entry>(ClassicColours(colours))) {}
+
+PCT::PCT(const std::vector<Entry>& entries) : BreakpointTable(entries) {
+    if (entries.size() < 2) {
+        throw kora::ParameterException(
+            "PCT", kora::ParameterException::PARAMETER_TOO_FEW_ITEMS,
+            kora::FormatString("A %d PCT entries", static_cast<int>(entries.size())),
+            "At least 2 PCT entries", "desc", kSourcePath,
+            "__cdecl kora::kubo::PCT::PCT(const class std::vector<struct std::pair<double,struct "
+            "kora::kubo::RGBTuple<unsigned char> >,class std::allocator<struct "
+            "std::pair<double,struct kora::kubo::RGBTuple<unsigned char> > > > &)",
+            80);
+    }
+    detail::SortByInput(m_entries);
+}
+
+PCT::PCT(const unsigned char* planes)
+    : BreakpointTable(detail::ClassicEntries<Entry>(InterleavePlanes(planes).data())) {}
+
+std::uint32_t PCT::GetSearchedColour(double x) const {
+    const detail::Bracket at = detail::Search(m_entries, x);
+    const Entry& upper = m_entries[at.index];
+    if (!at.between) {
+        return Pack(upper.second);
+    }
+    const Entry& lower = m_entries[at.index - 1];
+    const double position = (x - lower.first) / (upper.first - lower.first);
+    // Sorted finite inputs give a position in [0, 1]. Infinite inputs can give NaN (inf / inf)
+    // and inputs left unsorted by NaN anything at all: those are clamped to [0, 1], NaN to 1,
+    // so that no conversion overflows.
+    const double below = position < 1.0 ? position : 1.0;
+    const double t = below > 0.0 ? below : 0.0;
+    return Pack(Blend(lower.second.r, upper.second.r, t), Blend(lower.second.g, upper.second.g, t),
+                Blend(lower.second.b, upper.second.b, t));
+}
+
+bool IsClassicPCT(const PCT& pct) { return detail::HasClassicInputs(pct.GetEntries()); }
+
+}  // namespace kora::kubo

@@ -1,0 +1,158 @@
+#include "vrkframework/basic/kubo/luts/lut.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <limits>
+#include <string>
+#include <vector>
+
+#include "support/expectfailure.h"
+
+namespace {
+
+using kora::kubo::LUT;
+using Entries = std::vector<LUT::Entry>;
+
+constexpr char kSource[] = "vrkframework/basic/kubo/luts/lut";
+constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
+constexpr double kInf = std::numeric_limits<double>::infinity();
+
+std::vector<unsigned char> Bytes() {
+    std::vector<unsigned char> bytes(256);
+    for (unsigned int i = 0; i < 256; ++i) {
+        bytes[i] = static_cast<unsigned char>((i * 37 + 11) % 256);
+    }
+    return bytes;
+}
+
+TEST(LUT, InterpolatesBetweenAndClampsOutsideTheBreakpoints) {
+    const LUT lut(Entries{{0, 0}, {10, 100}});
+    // 1e300 lies outside the 64-bit range, so it has no direct index.
+    const double cases[][2] = {{5, 50},     {2.5, 25},  {-3, 0},      {12, 100}, {10, 100},
+                               {kInf, 100}, {-kInf, 0}, {1e300, 100}, {kNaN, 0}};
+    for (const auto& c : cases) {
+        EXPECT_EQ(lut.GetValue(c[0]), c[1]) << c[0];
+    }
+    const LUT uneven(Entries{{0.1, 1.0 / 3}, {0.7, 2.9}, {5, -4}});
+    EXPECT_EQ(uneven.GetValue(0.3), (0.3 - 0.1) / (0.7 - 0.1) * (2.9 - 1.0 / 3) + 1.0 / 3);
+}
+
+TEST(LUT, ByteTablesMapWholeInputsDirectlyAndInterpolateBetween) {
+    const std::vector<unsigned char> bytes = Bytes();
+    const LUT fromVector(bytes);
+    const LUT fromPointer(bytes.data());
+    EXPECT_EQ(fromVector.GetEntries(), fromPointer.GetEntries());
+    ASSERT_EQ(fromVector.GetEntryCount(), 256u);
+    for (unsigned int i = 0; i < 256; ++i) {
+        EXPECT_EQ(fromVector.GetEntries()[i], LUT::Entry(i, bytes[i]));
+        EXPECT_EQ(fromPointer.GetValue(i), bytes[i]) << i;
+    }
+    EXPECT_EQ(fromPointer.GetValue(7.5), 0.5 * (bytes[8] - bytes[7]) + bytes[7]);
+}
+
+TEST(LUT, EqualInputsAnswerWithTheDirectIndexElseTheFirstOfThem) {
+    // 1 truncates to index 1, whose input is 1: that entry answers, not the first 1.
+    const LUT direct(Entries{{1, 5}, {1, 7}, {2, 9}});
+    EXPECT_EQ(direct.GetValue(1), 7);
+    EXPECT_EQ(direct.GetValue(1.5), 8);
+    // 0.5 indexes entry 0 (input -1), so the search answers with the first 0.5.
+    const LUT searched(Entries{{-1, 0}, {0.5, 1}, {0.5, 3}, {2, 5}});
+    EXPECT_EQ(searched.GetValue(0.5), 1);
+    EXPECT_EQ(searched.GetValue(1), (1 - 0.5) / (2 - 0.5) * (5 - 3) + 3);
+    // 2^32 + 1 keeps the low 32 bits of its truncation: index 1.
+    const double big = 4294967297.0;
+    EXPECT_EQ(LUT(Entries{{big, 10}, {big, 20}, {big, 30}}).GetValue(big), 20);
+}
+
+TEST(LUT, SortsOnlyWhenANeighbourPairIsOutOfOrderNaNLast) {
+    EXPECT_EQ(LUT(Entries{{5, 1}, {0, 0}}).GetEntries(), (Entries{{0, 0}, {5, 1}}));
+    // In order already: kept as given, which an (unstable) sort of 40 equal inputs is not.
+    Entries equal;
+    for (int i = 0; i < 40; ++i) {
+        equal.emplace_back(1, i);
+    }
+    EXPECT_EQ(LUT(equal).GetEntries(), equal);
+
+    Entries mixed;
+    for (int i = 0; i < 100; ++i) {
+        mixed.emplace_back(i % 7 == 0 ? kNaN : 100.0 - i, i);  // 15 NaN, descending numbers
+    }
+    const Entries sorted = LUT(mixed).GetEntries();
+    for (std::size_t i = 0; i < sorted.size(); ++i) {
+        EXPECT_EQ(std::isnan(sorted[i].first), i >= 85) << i;
+        EXPECT_TRUE(i == 0 || !(sorted[i].first <= sorted[i - 1].first)) << i;  // ascending
+    }
+}
+
+TEST(LUT, ReportsEntriesRangeAndOutputsByIndex) {
+    const Entries entries{{-2, 4}, {3, 9}, {8, 1}};
+    LUT lut(entries);
+    Entries out{{0, 0}};
+    lut.GetEntries(out);
+    EXPECT_EQ(out, entries);
+    double min = 0;
+    double max = 0;
+    lut.GetInputValueRange(min, max);
+    EXPECT_EQ(min, -2);
+    EXPECT_EQ(max, 8);
+    EXPECT_EQ(lut.GetValueByIndex(1), 9);
+    EXPECT_EQ(lut.GetValueByIndex(1ull << 40), 1);  // past the end: the last, no stray read
+    lut = LUT(Entries{{0, 5}, {1, 6}});
+    const LUT moved(std::move(lut));
+    EXPECT_EQ(lut.GetEntryCount(), 2u);  // NOLINT(bugprone-use-after-move): moving copies
+    EXPECT_EQ(moved.GetValue(0.5), 5.5);
+}
+
+TEST(LUT, ClassicTablesHave256WholeByteOutputsAtInputs0To255) {
+    EXPECT_TRUE(IsClassicLUT(LUT(Bytes())));
+    Entries entries;
+    for (int i = 0; i < 256; ++i) {
+        entries.emplace_back(i, 255 - i);
+    }
+    EXPECT_TRUE(IsClassicLUT(LUT(entries)));
+    for (double output : {255.5, 256.0, -1.0, kNaN}) {
+        Entries changed = entries;
+        changed[100].second = output;
+        EXPECT_FALSE(IsClassicLUT(LUT(changed))) << output;
+    }
+    Entries shifted = entries;
+    shifted.back().first = 256;
+    EXPECT_FALSE(IsClassicLUT(LUT(shifted)));
+    entries.pop_back();
+    EXPECT_FALSE(IsClassicLUT(LUT(entries)));
+}
+
+TEST(LUT, ThrowsWhenByteVectorHasNot256Entries) {
+    for (std::size_t size : {255u, 257u}) {
+        const auto failure =
+            kubo_test::Catch<kora::DataException>([&] { LUT(std::vector<unsigned char>(size)); });
+        ASSERT_TRUE(failure);
+        kubo_test::ExpectReport(
+            *failure, ("LUT must have 256 entries, " + std::to_string(size) + " given.").c_str(),
+            kSource,
+            "__cdecl kora::kubo::LUT::LUT(const class std::vector<unsigned char,class "
+            "std::allocator<unsigned char> > &)",
+            50);
+    }
+}
+
+TEST(LUT, ThrowsWhenGivenFewerThanTwoEntries) {
+    for (std::size_t size : {1u, 0u}) {
+        const auto failure = kubo_test::Catch<kora::ParameterException>([&] {
+            LUT(Entries(size, {1, 1}));
+        });
+        ASSERT_TRUE(failure);
+        EXPECT_EQ(failure->GetParameterName(), "LUT");
+        EXPECT_EQ(static_cast<int>(failure->GetType()), 8);
+        EXPECT_EQ(failure->GetReceived(), "A " + std::to_string(size) + " LUT entries");
+        EXPECT_EQ(failure->GetExpected(), "At least 2 LUT entries");
+        kubo_test::ExpectReport(
+            *failure, "desc", kSource,
+            "__cdecl kora::kubo::LUT::LUT(const class std::vector<struct "
+            "std::pair<double,double>,class std::allocator<struct std::pair<double,double> > > &)",
+            80);
+    }
+}
+
+}  // namespace

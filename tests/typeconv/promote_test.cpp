@@ -1,0 +1,479 @@
+// The per-value rules of the four conversion families over all 100 pairs of component
+// types, in every kernel variant, against a plain reference of the documented rules.
+#include "vrkframework/basic/core/typeconv/promote.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <cstdint>
+#include <cstdio>
+#include <cstring>
+#include <functional>
+#include <limits>
+#include <memory>
+#include <ostream>
+#include <random>
+#include <string>
+#include <type_traits>
+#include <vector>
+
+#include "vrkframework/basic/core/typeconv/complex2realpromote.h"
+#include "vrkframework/basic/core/typeconv/complexpromote.h"
+#include "vrkframework/basic/core/typeconv/kernels.h"
+#include "vrkframework/basic/core/typeconv/real2complexpromote.h"
+
+namespace {
+
+using typeconv::detail::KernelSet;
+using typeconv::detail::KernelVariant;
+using typeconv::detail::SampleLayout;
+
+// ------------------------------------------------------------------ the reference
+
+template <class T>
+constexpr bool kSmallSigned = std::is_integral_v<T>&& std::is_signed_v<T> && sizeof(T) < 8;
+
+template <class T>
+long double High() {
+    return static_cast<long double>(std::numeric_limits<T>::max());
+}
+template <class T>
+long double Low() {
+    return static_cast<long double>(std::numeric_limits<T>::lowest());
+}
+
+// The documented result of NaN: INT32_MIN reduced to the width of B, or the top bit
+// alone in 64-bit destinations.
+template <class B>
+B NaNResult() {
+    if constexpr (sizeof(B) == 8) {
+        return static_cast<B>(std::uint64_t{1} << 63);
+    } else if constexpr (std::is_same_v<B, int>) {
+        return std::numeric_limits<int>::min();
+    } else {
+        return 0;
+    }
+}
+
+// x < y for integers of any two types, by value.
+template <class X, class Y>
+bool Less(X x, Y y) {
+    if constexpr (std::is_signed_v<X> == std::is_signed_v<Y>) {
+        return x < y;
+    } else if constexpr (std::is_signed_v<X>) {
+        return x < 0 || static_cast<std::uint64_t>(x) < static_cast<std::uint64_t>(y);
+    } else {
+        return y > 0 && static_cast<std::uint64_t>(x) < static_cast<std::uint64_t>(y);
+    }
+}
+
+template <class B, class A>
+B ExpectedFromInteger(A x) {
+    constexpr B kMax = std::numeric_limits<B>::max();
+    constexpr B kMin = std::numeric_limits<B>::lowest();
+    if constexpr (std::is_floating_point_v<B>) {
+        return static_cast<B>(x);  // the ordinary conversion: the nearest value
+    } else if constexpr (std::is_same_v<A, std::int64_t>) {
+        if constexpr (std::is_same_v<B, std::uint64_t>) {
+            return static_cast<B>(x);  // bit copy
+        } else {
+            return Less(x, kMax) ? static_cast<B>(x) : kMax;  // below the maximum: wraps
+        }
+    } else if constexpr (std::is_same_v<A, std::uint64_t>) {
+        return Less(kMax, x) ? kMax : static_cast<B>(x);
+    } else if constexpr (kSmallSigned<A> && sizeof(B) == 8) {
+        return x < 1 ? B(0) : static_cast<B>(x);
+    } else {
+        if (Less(kMax, x)) {
+            return kMax;
+        }
+        if (Less(x, kMin)) {
+            return kMin;
+        }
+        return static_cast<B>(x);
+    }
+}
+
+template <class B, class A>
+B ExpectedFromFloating(A x) {
+    if constexpr (std::is_floating_point_v<B>) {
+        return static_cast<B>(x);
+    } else {
+        if (std::isnan(x)) {
+            return NaNResult<B>();
+        }
+        const long double v = static_cast<long double>(x);
+        if constexpr (sizeof(B) == 8) {
+            const long double high = std::is_signed_v<B> ? 0x1p63L : 0x1p64L;
+            if (v <= 0) {
+                return 0;
+            }
+            if (v >= high) {
+                return std::numeric_limits<B>::max();
+            }
+            return static_cast<B>(std::trunc(v));
+        } else {
+            // y = x + 0.5 (or x - 0.5 for signed destinations below 0), one rounding to
+            // A; the thresholds are B's limits as values of A.
+            const long double half = std::is_signed_v<B> && v < 0 ? -0.5L : 0.5L;
+            const long double y = static_cast<long double>(static_cast<A>(v + half));
+            const long double high =
+                static_cast<long double>(static_cast<A>(std::numeric_limits<B>::max()));
+            if (y >= high) {
+                return std::numeric_limits<B>::max();
+            }
+            if (std::is_signed_v<B> ? y < Low<B>() : y <= 0) {
+                return std::numeric_limits<B>::lowest();
+            }
+            return static_cast<B>(std::trunc(y));
+        }
+    }
+}
+
+template <class B, class A>
+B Expected(A x) {
+    if constexpr (std::is_floating_point_v<A>) {
+        return ExpectedFromFloating<B>(x);
+    } else {
+        return ExpectedFromInteger<B>(x);
+    }
+}
+
+// ------------------------------------------------------------------ inputs
+
+// Boundary values of every destination, halves around them, specials, then random
+// bit patterns; those A cannot hold are skipped.
+template <class A>
+std::vector<A> Inputs() {
+    std::vector<A> values;
+    const long double edges[] = {0x1p7L,  0x1p8L,  0x1p15L, 0x1p16L, 0x1p31L, 0x1p32L,
+                                 0x1p53L, 0x1p63L, 0x1p64L, 200,     1000,    2,
+                                 1,       0x1p23L, 0x1p24L, 0x1p52L};
+    std::vector<long double> candidates = {0, 0.5L, 0.4L, 0.6L, 1.5L, 2.5L, 126.6L, 254.5L};
+    for (long double edge : edges) {
+        for (long double delta : {-2.0L, -1.0L, -0.5L, -0.25L, 0.0L, 0.25L, 0.5L, 1.0L}) {
+            candidates.push_back(edge + delta);
+        }
+    }
+    for (long double candidate : std::vector<long double>(candidates)) {
+        candidates.push_back(-candidate);
+    }
+    for (long double candidate : candidates) {
+        if (candidate >= Low<A>() && candidate <= High<A>()) {
+            values.push_back(static_cast<A>(candidate));
+        }
+    }
+    values.push_back(std::numeric_limits<A>::max());
+    values.push_back(std::numeric_limits<A>::lowest());
+    if constexpr (std::is_floating_point_v<A>) {
+        for (A special :
+             {std::numeric_limits<A>::infinity(), std::numeric_limits<A>::quiet_NaN(),
+              std::numeric_limits<A>::denorm_min(), A(0.49999997f), A(8388609.0f), A(-8388609.0f),
+              A(2147483520.0f), A(4294967040.0f), A(1e30f), std::numeric_limits<A>::min()}) {
+            values.push_back(special);
+            values.push_back(-special);
+        }
+        if constexpr (std::is_same_v<A, double>) {
+            for (double special : {2147483646.5, 4294967294.5, 9223372036854774784.0,
+                                   18446744073709549568.0, 3.5e38, 1e300}) {
+                values.push_back(special);
+                values.push_back(-special);
+            }
+        }
+    }
+    std::mt19937_64 random(20240611u);
+    for (int i = 0; i < 600; ++i) {
+        const std::uint64_t bits = random();
+        A value;
+        std::memcpy(&value, &bits, sizeof value);
+        values.push_back(value);
+        // Random integers of every width, so narrow values reach wide sources too.
+        const long double narrow =
+            static_cast<long double>(static_cast<std::int64_t>(bits) >> (i % 64));
+        if (narrow >= Low<A>() && narrow <= High<A>()) {
+            values.push_back(static_cast<A>(narrow));
+        }
+    }
+    return values;
+}
+
+// ------------------------------------------------------------------ checking
+
+template <class B>
+bool SameValue(B actual, B expected) {
+    if constexpr (std::is_floating_point_v<B>) {
+        if (std::isnan(expected)) {
+            return std::isnan(actual);
+        }
+        return std::memcmp(&actual, &expected, sizeof actual) == 0;  // -0.0 is not 0.0
+    } else {
+        return actual == expected;
+    }
+}
+
+template <class T>
+std::string Show(T value) {
+    if constexpr (std::is_floating_point_v<T>) {
+        char text[64];
+        std::snprintf(text, sizeof text, "%.17g", static_cast<double>(value));
+        return text;
+    } else if constexpr (std::is_signed_v<T>) {
+        return std::to_string(static_cast<long long>(value));
+    } else {
+        return std::to_string(static_cast<unsigned long long>(value));
+    }
+}
+
+constexpr unsigned char kSentinel = 0xA5;
+constexpr std::size_t kGuard = 32;
+const std::size_t kLengths[] = {0, 1, 7, 8, 9, 17, 1003};
+const SampleLayout kLayouts[] = {SampleLayout::kReal, SampleLayout::kComplex,
+                                 SampleLayout::kRealToComplex, SampleLayout::kComplexToReal};
+
+/// Compares one converted value with the reference: empty when equal, else a description.
+template <class A, class B>
+std::string Mismatch(const unsigned char* in, const unsigned char* out) {
+    A x;
+    B actual;
+    std::memcpy(&x, in, sizeof x);
+    std::memcpy(&actual, out, sizeof actual);
+    const B expected = Expected<B>(x);
+    if (SameValue(actual, expected)) {
+        return {};
+    }
+    return Show(x) + " gave " + Show(actual) + ", expected " + Show(expected);
+}
+
+template <class A>
+std::vector<unsigned char> InputBytes() {
+    const std::vector<A> values = Inputs<A>();
+    std::vector<unsigned char> bytes(values.size() * sizeof(A));
+    std::memcpy(bytes.data(), values.data(), bytes.size());
+    return bytes;
+}
+
+template <class A, class B>
+std::unique_ptr<typeconv::IPromote> NewFamily(SampleLayout layout) {
+    switch (layout) {
+        case SampleLayout::kReal:
+            return std::make_unique<typeconv::Promote<A, B>>();
+        case SampleLayout::kComplex:
+            return std::make_unique<typeconv::ComplexPromote<A, B>>();
+        case SampleLayout::kRealToComplex:
+            return std::make_unique<typeconv::Real2ComplexPromote<A, B>>();
+        case SampleLayout::kComplexToReal:
+            break;
+    }
+    return std::make_unique<typeconv::Complex2RealPromote<A, B>>();
+}
+
+/// What the checks need of a pair; only these few functions are instantiated per pair.
+struct Pair {
+    std::string name;
+    std::size_t from;
+    std::size_t to;
+    std::size_t fromSize;
+    std::size_t toSize;
+    std::vector<unsigned char> (*inputs)();
+    std::string (*mismatch)(const unsigned char* in, const unsigned char* out);
+    std::unique_ptr<typeconv::IPromote> (*newFamily)(SampleLayout layout);
+};
+
+void PrintTo(const Pair& pair, std::ostream* out) { *out << pair.name; }
+
+using Run = std::function<void(const void* src, void* dst, std::size_t count)>;
+
+/// Runs one family over `count` samples of the input values (cycled) and checks every
+/// value, the zero imaginary parts and the guard bytes after the output.
+void CheckFamily(const Pair& pair, SampleLayout layout, const std::vector<unsigned char>& values,
+                 std::size_t count, const Run& run, const std::string& where) {
+    const bool complexIn =
+        layout == SampleLayout::kComplex || layout == SampleLayout::kComplexToReal;
+    const bool complexOut =
+        layout == SampleLayout::kComplex || layout == SampleLayout::kRealToComplex;
+    const std::size_t valueCount = values.size() / pair.fromSize;
+    std::vector<unsigned char> input((complexIn ? 2 : 1) * count * pair.fromSize);
+    for (std::size_t i = 0; i < input.size() / pair.fromSize; ++i) {
+        std::memcpy(input.data() + i * pair.fromSize,
+                    values.data() + (i * 7 + count) % valueCount * pair.fromSize, pair.fromSize);
+    }
+    const std::size_t outBytes = (complexOut ? 2 : 1) * count * pair.toSize;
+    std::vector<unsigned char> output(outBytes + kGuard, kSentinel);
+    run(input.data(), output.data(), count);
+    ASSERT_EQ(std::vector<unsigned char>(output.begin() + static_cast<std::ptrdiff_t>(outBytes),
+                                         output.end()),
+              std::vector<unsigned char>(kGuard, kSentinel))
+        << where << ", count " << count;
+    const std::vector<unsigned char> zero(pair.toSize, 0);
+    for (std::size_t i = 0; i < count; ++i) {
+        const unsigned char* in = input.data() + (complexIn ? 2 : 1) * i * pair.fromSize;
+        const unsigned char* out = output.data() + (complexOut ? 2 : 1) * i * pair.toSize;
+        const std::string real = pair.mismatch(in, out);
+        ASSERT_TRUE(real.empty()) << where << ", count " << count << ", sample " << i << ": "
+                                  << real;
+        if (layout == SampleLayout::kComplex) {
+            const std::string imaginary = pair.mismatch(in + pair.fromSize, out + pair.toSize);
+            ASSERT_TRUE(imaginary.empty()) << where << ", imaginary part: " << imaginary;
+        } else if (layout == SampleLayout::kRealToComplex) {
+            ASSERT_EQ(std::memcmp(out + pair.toSize, zero.data(), pair.toSize), 0)
+                << where << ", imaginary part";
+        }
+    }
+}
+
+void CheckPair(const Pair& pair) {
+    const std::vector<unsigned char> values = pair.inputs();
+    for (SampleLayout layout : kLayouts) {
+        const std::string family = "layout " + std::to_string(static_cast<int>(layout));
+        // Every variant this processor runs, over all the values at once and the lengths
+        // that reach vector bodies and tails; 2500 samples cross the complex layouts' blocks.
+        for (KernelVariant variant : {KernelVariant::kBaseline, KernelVariant::kAvx2}) {
+            const KernelSet* kernels = typeconv::detail::FindKernels(variant);
+            if (kernels == nullptr) {
+                continue;
+            }
+            const std::string where =
+                family + ", variant " + std::to_string(static_cast<int>(variant));
+            const Run run = [&](const void* src, void* dst, std::size_t count) {
+                typeconv::detail::RunPromote(*kernels, layout, pair.from, pair.to, src, dst, count);
+            };
+            CheckFamily(pair, layout, values, values.size() / pair.fromSize, run, where);
+            CheckFamily(pair, layout, values, 2500, run, where);
+            for (std::size_t count : kLengths) {
+                CheckFamily(pair, layout, values, count, run, where);
+            }
+        }
+        // The class, through its interface.
+        const std::unique_ptr<typeconv::IPromote> promote = pair.newFamily(layout);
+        EXPECT_EQ(promote->GetInputBits(), pair.fromSize * 8);
+        EXPECT_EQ(promote->GetOutputBits(), pair.toSize * 8);
+        const Run run = [&](const void* src, void* dst, std::size_t count) {
+            promote->Promote(src, dst, static_cast<unsigned int>(count));
+        };
+        for (std::size_t count : kLengths) {
+            CheckFamily(pair, layout, values, count, run, family + ", class");
+        }
+    }
+}
+
+// ------------------------------------------------------------------ the 100 pairs
+
+template <class T>
+std::string Name() {
+    if constexpr (std::is_floating_point_v<T>) {
+        return sizeof(T) == 4 ? "Float32" : "Float64";
+    } else {
+        return std::string(std::is_signed_v<T> ? "Int" : "UInt") + std::to_string(sizeof(T) * 8);
+    }
+}
+
+template <class A, class B>
+Pair MakePair() {
+    return {Name<A>() + "_" + Name<B>(),
+            typeconv::detail::ComponentIndexOf<A>(),
+            typeconv::detail::ComponentIndexOf<B>(),
+            sizeof(A),
+            sizeof(B),
+            &InputBytes<A>,
+            &Mismatch<A, B>,
+            &NewFamily<A, B>};
+}
+
+std::vector<Pair> AllPairs() {
+    std::vector<Pair> pairs;
+#define KUBO_TEST_PAIR(A, B) pairs.push_back(MakePair<A, B>());
+    KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_TEST_PAIR)
+#undef KUBO_TEST_PAIR
+    return pairs;
+}
+
+class EveryPair : public testing::TestWithParam<Pair> {};
+
+TEST_P(EveryPair, FollowsTheRuleInEveryFamilyAndVariant) { CheckPair(GetParam()); }
+
+INSTANTIATE_TEST_SUITE_P(Promote, EveryPair, testing::ValuesIn(AllPairs()),
+                         [](const testing::TestParamInfo<Pair>& pair) { return pair.param.name; });
+
+// ------------------------------------------------------------------ documented cases
+
+template <class B, class A>
+std::vector<B> Converted(typeconv::IPromote&& promote, const std::vector<A>& input,
+                         unsigned int count) {
+    std::vector<B> output(2 * input.size() + 1, B(77));
+    promote.Promote(input.data(), output.data(), count);
+    return output;
+}
+
+TEST(Promote, DocumentedExamples) {
+    EXPECT_EQ((Converted<unsigned char>(typeconv::Promote<char, unsigned char>(),
+                                        std::vector<char>{-5, 0, 100}, 3)),
+              (std::vector<unsigned char>{0, 0, 100, 77, 77, 77, 77}));
+    EXPECT_EQ((Converted<char>(typeconv::Promote<unsigned char, char>(),
+                               std::vector<unsigned char>{200}, 1)[0]),
+              127);
+    const float nan = std::numeric_limits<float>::quiet_NaN();
+    EXPECT_EQ((Converted<char>(typeconv::Promote<float, char>(),
+                               std::vector<float>{2.5f, -2.5f, 126.6f, -300.0f, nan}, 5)),
+              (std::vector<char>{3, -3, 127, -128, 0, 77, 77, 77, 77, 77, 77}));
+    EXPECT_EQ((Converted<unsigned char>(typeconv::Promote<float, unsigned char>(),
+                                        std::vector<float>{-0.4f, -0.6f, 254.5f}, 3)),
+              (std::vector<unsigned char>{0, 0, 255, 77, 77, 77, 77}));
+    EXPECT_EQ((Converted<std::int64_t>(typeconv::Promote<double, std::int64_t>(),
+                                       std::vector<double>{-1.0, 2.9}, 2)),
+              (std::vector<std::int64_t>{0, 2, 77, 77, 77}));
+    EXPECT_EQ((Converted<std::int64_t>(typeconv::Promote<int, std::int64_t>(), std::vector<int>{-7},
+                                       1)[0]),
+              0);
+    EXPECT_EQ((Converted<char>(typeconv::Promote<std::int64_t, char>(),
+                               std::vector<std::int64_t>{-200, 1000}, 2)),
+              (std::vector<char>{56, 127, 77, 77, 77}));
+    EXPECT_EQ((Converted<float>(typeconv::Complex2RealPromote<short, float>(),
+                                std::vector<short>{3, 4}, 1)),
+              (std::vector<float>{3.0f, 77, 77, 77, 77}));
+    EXPECT_EQ(
+        (Converted<short>(typeconv::Real2ComplexPromote<char, short>(), std::vector<char>{-5}, 1)),
+        (std::vector<short>{-5, 0, 77}));
+    EXPECT_EQ(
+        (Converted<short>(typeconv::ComplexPromote<short, short>(), std::vector<short>{-5, 9}, 0)),
+        (std::vector<short>{77, 77, 77, 77, 77}));
+}
+
+TEST(Promote, ThresholdsAreComparedInTheSourcePrecision) {
+    // float(INT32_MAX) is 2^31: 2147483520.0f (the float below) converts, 2^31 saturates.
+    EXPECT_EQ((Converted<int>(typeconv::Promote<float, int>(),
+                              std::vector<float>{2147483520.0f, 2147483648.0f}, 2)),
+              (std::vector<int>{2147483520, 2147483647, 77, 77, 77}));
+    EXPECT_EQ((Converted<int>(typeconv::Promote<double, int>(),
+                              std::vector<double>{2147483646.4, 2147483646.5}, 2)),
+              (std::vector<int>{2147483646, 2147483647, 77, 77, 77}));
+    // y = x + 0.5 is rounded to float: 0.49999997f + 0.5f is 1.0f.
+    EXPECT_EQ((Converted<unsigned char>(typeconv::Promote<float, unsigned char>(),
+                                        std::vector<float>{0.49999997f}, 1)[0]),
+              1);
+    EXPECT_EQ((Converted<unsigned char>(typeconv::Promote<double, unsigned char>(),
+                                        std::vector<double>{0.49999997}, 1)[0]),
+              0);
+}
+
+TEST(Promote, NaNAndInfinities) {
+    const double nan = std::numeric_limits<double>::quiet_NaN();
+    const double inf = std::numeric_limits<double>::infinity();
+    EXPECT_EQ(
+        (Converted<int>(typeconv::Promote<double, int>(), std::vector<double>{nan, inf, -inf}, 3)),
+        (std::vector<int>{INT32_MIN, INT32_MAX, INT32_MIN, 77, 77, 77, 77}));
+    EXPECT_EQ((Converted<unsigned int>(typeconv::Promote<double, unsigned int>(),
+                                       std::vector<double>{nan, inf}, 2)),
+              (std::vector<unsigned int>{0, UINT32_MAX, 77, 77, 77}));
+    EXPECT_EQ((Converted<std::int64_t>(typeconv::Promote<double, std::int64_t>(),
+                                       std::vector<double>{nan, inf}, 2)),
+              (std::vector<std::int64_t>{INT64_MIN, INT64_MAX, 77, 77, 77}));
+    EXPECT_EQ((Converted<std::uint64_t>(typeconv::Promote<double, std::uint64_t>(),
+                                        std::vector<double>{nan, -inf}, 2)),
+              (std::vector<std::uint64_t>{std::uint64_t{1} << 63, 0, 77, 77, 77}));
+    const std::vector<float> overflow =
+        Converted<float>(typeconv::Promote<double, float>(), std::vector<double>{1e300, -1e300}, 2);
+    EXPECT_EQ(overflow[0], std::numeric_limits<float>::infinity());
+    EXPECT_EQ(overflow[1], -std::numeric_limits<float>::infinity());
+}
+
+}  // namespace
