@@ -22,8 +22,9 @@ constexpr std::size_t kBlock = 32;
 constexpr unsigned int kCountShift = detail::kLittleEndian ? 0 : 8;
 constexpr unsigned int kValueShift = 8 - kCountShift;
 
+// Four pairs loaded lowest byte first: the counts in the low byte of each 16-bit lane.
 constexpr std::uint64_t kCountBytes = 0x00FF00FF00FF00FFull;
-constexpr std::uint64_t kCountsOfOne = 0x0001000100010001ull;
+constexpr std::uint64_t kLaneOnes = 0x0001000100010001ull;
 
 // The values of the four pairs in `pairs` (loaded lowest byte first), in the low bytes.
 std::uint32_t ValuesOfFour(std::uint64_t pairs) {
@@ -119,9 +120,8 @@ public:
     // The counts of the four pairs from `pair` on (all within the stream), summed in the
     // 16-bit lanes of one word.
     std::uint32_t SumOfFour(std::size_t pair) const {
-        const std::uint64_t counts =
-            detail::LoadLowFirst(m_pairs + 2 * pair) & 0x00FF00FF00FF00FFull;
-        return static_cast<std::uint32_t>((counts * 0x0001000100010001ull) >> 48);
+        const std::uint64_t counts = detail::LoadLowFirst(m_pairs + 2 * pair) & kCountBytes;
+        return static_cast<std::uint32_t>((counts * kLaneOnes) >> 48);
     }
 
 private:
@@ -195,8 +195,8 @@ void RLECompressedData::Decode(unsigned char* out) const {
             // time; writing all four values is safe, as four more pairs are left.
             if (end - pair >= 8) {
                 const std::uint64_t four = detail::LoadLowFirst(pair);
-                const std::uint64_t others = (four & kCountBytes) ^ kCountsOfOne;
-                detail::StoreLowFirst4(out, ValuesOfFour(four));
+                const std::uint64_t others = (four & kCountBytes) ^ kLaneOnes;
+                detail::StoreLowFirst(out, ValuesOfFour(four));
                 const unsigned int singles = others == 0 ? 4 : detail::LowestSetBit(others) / 16;
                 out += singles;
                 pair += 2 * singles;

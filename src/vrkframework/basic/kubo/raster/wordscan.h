@@ -59,14 +59,8 @@ inline std::uint64_t LoadLowFirst(const unsigned char* bytes) {
     return kLittleEndian ? word : ByteSwap(word);
 }
 
-/// Stores `word` at `bytes` with its lowest byte in bytes[0].
-inline void StoreLowFirst(unsigned char* bytes, std::uint64_t word) {
-    const std::uint64_t ordered = kLittleEndian ? word : ByteSwap(word);
-    std::memcpy(bytes, &ordered, sizeof ordered);
-}
-
 /// Stores the 4 bytes of `word` at `bytes`, lowest byte first.
-inline void StoreLowFirst4(unsigned char* bytes, std::uint32_t word) {
+inline void StoreLowFirst(unsigned char* bytes, std::uint32_t word) {
     const auto ordered =
         kLittleEndian ? word : static_cast<std::uint32_t>(ByteSwap(std::uint64_t{word}) >> 32);
     std::memcpy(bytes, &ordered, sizeof ordered);
