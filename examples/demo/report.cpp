@@ -7,7 +7,7 @@
 namespace demo {
 
 void Line(const char* step, const char* format, ...) {
-    std::printf("  %-13s ", step);
+    std::printf("  %-15s ", step);
     va_list args;
     va_start(args, format);
     std::vprintf(format, args);
