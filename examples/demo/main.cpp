@@ -267,11 +267,11 @@ std::vector<unsigned char> InterpretRadar(const demo::Terrain& terrain) {
     std::vector<float> sorted(decibels);
     const auto top = static_cast<std::ptrdiff_t>(0.99 * static_cast<double>(count));
     std::nth_element(sorted.begin(), sorted.begin() + top, sorted.end());
-    const double high = sorted[static_cast<std::size_t>(top)];
+    const auto high = static_cast<double>(sorted[static_cast<std::size_t>(top)]);
     const kora::kubo::LUT display({{high - 20.0, 0.0}, {high, 255.0}});
     std::vector<unsigned char> grey(count);
     for (std::size_t i = 0; i < count; ++i) {
-        grey[i] = static_cast<unsigned char>(display.GetValue(decibels[i]));
+        grey[i] = static_cast<unsigned char>(display.GetValue(static_cast<double>(decibels[i])));
     }
     demo::Line("radar C16S",
                "amplitude %.2f ns/pixel into 32R, mean |phase| %.2f rad (pi/2 for "
