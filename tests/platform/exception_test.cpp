@@ -4,42 +4,28 @@
 
 namespace {
 
-TEST(Exception, KeepsItsFourPartsAndReturnsTheMessageFromWhat) {
-    const kora::Exception failure("message", "a/b/c", "void f(int)", 42);
-    EXPECT_STREQ(failure.what(), "message");
-    EXPECT_EQ(failure.GetMessage(), "message");
-    EXPECT_EQ(failure.GetSourceFile(), "a/b/c");
-    EXPECT_EQ(failure.GetFunction(), "void f(int)");
-    EXPECT_EQ(failure.GetLine(), 42u);
-}
-
-TEST(Exception, DerivedFailuresAreCaughtAsTheBaseAndAsStdException) {
+TEST(Exception, EveryClassKeepsItsReportAndIsCaughtAsTheBase) {
     try {
-        throw kora::DataException("bad data", "src", "fn", 7);
+        throw kora::DataException("bad data", "a/b/c", "void f(int)", 42);
     } catch (const std::exception& failure) {
+        const auto* base = dynamic_cast<const kora::Exception*>(&failure);
+        ASSERT_NE(base, nullptr);
         EXPECT_STREQ(failure.what(), "bad data");
-        EXPECT_NE(dynamic_cast<const kora::DataException*>(&failure), nullptr);
-        EXPECT_NE(dynamic_cast<const kora::Exception*>(&failure), nullptr);
+        EXPECT_EQ(base->GetSourceFile(), "a/b/c");
+        EXPECT_EQ(base->GetFunction(), "void f(int)");
+        EXPECT_EQ(base->GetLine(), 42u);
     }
-}
-
-TEST(ParameterException, KeepsParameterTypeReceivedAndExpected) {
-    const kora::ParameterException failure("LUT", kora::ParameterException::Type(8), "A 1",
-                                           "At least 2", "desc", "src", "fn", 80);
-    EXPECT_EQ(failure.GetParameterName(), "LUT");
-    EXPECT_EQ(static_cast<int>(failure.GetType()), 8);
-    EXPECT_EQ(failure.GetReceived(), "A 1");
-    EXPECT_EQ(failure.GetExpected(), "At least 2");
-    EXPECT_EQ(failure.GetMessage(), "desc");
-    EXPECT_EQ(failure.GetLine(), 80u);
+    const kora::ParameterException parameter("LUT",
+                                             kora::ParameterException::PARAMETER_TOO_FEW_ITEMS,
+                                             "A 1", "At least 2", "desc", "src", "fn", 80);
+    EXPECT_EQ(parameter.GetParameterName(), "LUT");
+    EXPECT_EQ(static_cast<int>(parameter.GetType()), 8);
     EXPECT_EQ(static_cast<int>(kora::ParameterException::PARAMETER_INVALID_VALUE), 1);
-    EXPECT_EQ(static_cast<int>(kora::ParameterException::PARAMETER_TOO_FEW_ITEMS), 8);
-}
-
-TEST(OutOfBoundsException, KeepsItsValues) {
-    const kora::OutOfBoundsException failure({1, 2, 3, 3}, "outside", "src", "fn", 190);
-    EXPECT_EQ(failure.GetValues(), (std::vector<int>{1, 2, 3, 3}));
-    EXPECT_STREQ(failure.what(), "outside");
+    EXPECT_EQ(parameter.GetReceived(), "A 1");
+    EXPECT_EQ(parameter.GetExpected(), "At least 2");
+    EXPECT_EQ(parameter.GetMessage(), "desc");
+    const kora::OutOfBoundsException bounds({1, 2, 3, 3}, "outside", "src", "fn", 190);
+    EXPECT_EQ(bounds.GetValues(), (std::vector<int>{1, 2, 3, 3}));
 }
 
 }  // namespace

@@ -8,61 +8,49 @@ namespace {
 
 using kora::kubo::DataType;
 using kora::kubo::DataTypeConstraints;
-using kora::kubo::IDataTypeConstraints;
 
-void ExpectRange(const DataTypeConstraints& range, double min, double max, double epsilon) {
+void ExpectRange(const kora::kubo::IDataTypeConstraints& range, double min, double max,
+                 double epsilon) {
     EXPECT_EQ(range.GetMin(), min);
     EXPECT_EQ(range.GetMax(), max);
     EXPECT_EQ(range.GetEpsilon(), epsilon);
 }
 
-TEST(DataTypeConstraints, DefaultAndGivenValues) {
+TEST(DataTypeConstraints, NaturalRangeOfOneComponent) {
+    constexpr double kFloat = 3.4028234663852886e38;
+    constexpr double kDouble = 1.7976931348623157e308;
+    struct Case {
+        DataType type;
+        double min, max, epsilon;
+    };
+    const Case cases[] = {
+        {DataType::Type1U, 0.0, 1.0, 1.0},
+        {DataType::Type8S, -128.0, 127.0, 1.0},
+        {DataType::TypeC16U, 0.0, 65535.0, 1.0},
+        {DataType::Type32S, -2147483648.0, 2147483647.0, 1.0},
+        {DataType::Type64U, 0.0, 1.8446744073709552e19, 1.0},  // 2^64 - 1 rounds in double
+        {DataType(12, false, false, 12, 0, false), 0.0, 4095.0, 1.0},
+        {DataType::TypeC32R, -kFloat, kFloat, 1.1920928955078125e-07},
+        {DataType(16, true, true, 10, 5, false), -kFloat, kFloat, 1.1920928955078125e-07},
+        {DataType::Type64R, -kDouble, kDouble, 2.220446049250313e-16},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.type.bits);
+        ExpectRange(DataTypeConstraints(c.type), c.min, c.max, c.epsilon);
+    }
     ExpectRange(DataTypeConstraints(), 0.0, 0.0, 0.0);
-    ExpectRange(DataTypeConstraints(-1.5, 2.5, 0.25), -1.5, 2.5, 0.25);
 }
 
-TEST(DataTypeConstraints, NaturalRangesOfIntegerTypes) {
-    ExpectRange(DataTypeConstraints(DataType::Type1U), 0.0, 1.0, 1.0);
-    ExpectRange(DataTypeConstraints(DataType::Type8U), 0.0, 255.0, 1.0);
-    ExpectRange(DataTypeConstraints(DataType::Type8S), -128.0, 127.0, 1.0);
-    ExpectRange(DataTypeConstraints(DataType::Type16S), -32768.0, 32767.0, 1.0);
-    ExpectRange(DataTypeConstraints(DataType::Type32U), 0.0, 4294967295.0, 1.0);
-    ExpectRange(DataTypeConstraints(DataType::Type32S), -2147483648.0, 2147483647.0, 1.0);
-    // 2^64 - 1 and 2^63 - 1 round in double.
-    ExpectRange(DataTypeConstraints(DataType::Type64U), 0.0, 1.8446744073709552e19, 1.0);
-    ExpectRange(DataTypeConstraints(DataType::Type64S), -9223372036854775808.0,
-                9223372036854775807.0, 1.0);
-    ExpectRange(DataTypeConstraints(DataType(12, false, false, 12, 0, false)), 0.0, 4095.0, 1.0);
-}
-
-TEST(DataTypeConstraints, NaturalRangesOfFloatingTypes) {
-    ExpectRange(DataTypeConstraints(DataType::Type32R), -3.4028234663852886e38,
-                3.4028234663852886e38, 1.1920928955078125e-07);
-    ExpectRange(DataTypeConstraints(DataType::Type64R), -1.7976931348623157e308,
-                1.7976931348623157e308, 2.220446049250313e-16);
-    // Up to 32 bits every signed floating type gets the float range.
-    ExpectRange(DataTypeConstraints(DataType(16, true, true, 10, 5, false)), -3.4028234663852886e38,
-                3.4028234663852886e38, 1.1920928955078125e-07);
-}
-
-TEST(DataTypeConstraints, ComplexFlagIsIgnored) {
-    ExpectRange(DataTypeConstraints(DataType::TypeC16U), 0.0, 65535.0, 1.0);
-    ExpectRange(DataTypeConstraints(DataType::TypeC32R), -3.4028234663852886e38,
-                3.4028234663852886e38, 1.1920928955078125e-07);
-}
-
-TEST(DataTypeConstraints, IsBoundedWhenTheNaturalRangeSticksOut) {
+TEST(DataTypeConstraints, IsBoundedOnlyWhenTheRangeSticksOut) {
     const DataTypeConstraints byteRange(0.0, 255.0, 1.0);
     EXPECT_FALSE(byteRange.IsBounded(DataType::Type8U));  // equal bounds do not count
     EXPECT_TRUE(byteRange.IsBounded(DataType::Type8S));
     EXPECT_TRUE(byteRange.IsBounded(DataType::Type16U));
-    EXPECT_FALSE(byteRange.IsBounded(DataType::Type1U));
-    EXPECT_FALSE(DataTypeConstraints(DataType::Type64R).IsBounded(DataType::Type32R));
     EXPECT_TRUE(DataTypeConstraints(DataType::Type32R).IsBounded(DataType::Type64R));
 }
 
-// Any implementation of the interface can be assigned into the stored form.
-class FixedRange : public IDataTypeConstraints {
+// Any implementation of the interface assigns through its getters.
+class FixedRange : public kora::kubo::IDataTypeConstraints {
 public:
     bool IsBounded(const DataType&) const override { return false; }
     double GetMin() const override { return -2.0; }
@@ -72,13 +60,9 @@ public:
 
 TEST(DataTypeConstraints, CopiesAndAssignsFromAnyImplementation) {
     DataTypeConstraints range;
-    range = static_cast<const IDataTypeConstraints&>(FixedRange());
-    ExpectRange(range, -2.0, 9.0, 0.5);
-
-    const DataTypeConstraints copy(range);
-    ExpectRange(copy, -2.0, 9.0, 0.5);
+    range = static_cast<const kora::kubo::IDataTypeConstraints&>(FixedRange());
     DataTypeConstraints assigned;
-    assigned = copy;
+    assigned = DataTypeConstraints(range);
     ExpectRange(assigned, -2.0, 9.0, 0.5);
 }
 
