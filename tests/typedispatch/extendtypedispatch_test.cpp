@@ -19,33 +19,28 @@ struct IProbe {
     virtual const std::type_info& First() const = 0;
     virtual const std::type_info& Second() const = 0;
 };
-
-template <class T>
-struct OneProbe : IProbe {
-    const std::type_info& First() const override { return typeid(T); }
-    const std::type_info& Second() const override { return typeid(void); }
-};
-
-template <class A, class B>
-struct TwoProbe : IProbe {
+template <class A, class B = void>
+struct Probe : IProbe {
     const std::type_info& First() const override { return typeid(A); }
     const std::type_info& Second() const override { return typeid(B); }
 };
+template <class A>
+using OneProbe = Probe<A>;
 
+template <class Candidates, class List = ComponentTypes>
 using One =
     kora::typedispatch::ExtendDispatchTypes<kora::typedispatch::Factory1Template<OneProbe, IProbe>,
-                                            1, ComponentTypes, ComponentTypes, NullDataType>;
+                                            1, List, Candidates, NullDataType>;
 using Two =
-    kora::typedispatch::ExtendDispatchTypes<kora::typedispatch::Factory2Template<TwoProbe, IProbe>,
-                                            2, ComponentTypes, ComponentTypes, NullDataType>;
+    kora::typedispatch::ExtendDispatchTypes<kora::typedispatch::Factory2Template<Probe, IProbe>, 2,
+                                            ComponentTypes, ComponentTypes, NullDataType>;
 
 struct Candidate {
     DataType real;
     DataType complex;
     const std::type_info& type;
 };
-
-// The documented table of candidates, written out independently of the traits.
+// The candidates in search order, written out independently of the traits.
 const Candidate kCandidates[] = {
     {DataType::Type8S, DataType::TypeC8S, typeid(char)},
     {DataType::Type8U, DataType::TypeC8U, typeid(unsigned char)},
@@ -59,114 +54,70 @@ const Candidate kCandidates[] = {
     {DataType::Type64U, DataType::TypeC64U, typeid(std::uint64_t)},
 };
 
-TEST(ExtendDispatchTypes, OnePositionCreatesTheMatchingInstance) {
-    for (const Candidate& candidate : kCandidates) {
-        std::unique_ptr<IProbe> probe(One::Dispatch({candidate.real}, false));
-        EXPECT_EQ(probe->First(), candidate.type) << candidate.type.name();
-        probe.reset(One::Dispatch({candidate.complex}, true));
-        EXPECT_EQ(probe->First(), candidate.type) << candidate.type.name();
-        probe.reset(One::Dispatch({candidate.real}, true));
-        EXPECT_EQ(probe->First(), candidate.type) << candidate.type.name();
-    }
-}
-
-TEST(ExtendDispatchTypes, TwoPositionsCoverEveryPairInOrder) {
+TEST(ExtendDispatchTypes, CreatesTheInstanceOfTheMatchingTypes) {
     for (const Candidate& from : kCandidates) {
+        std::unique_ptr<IProbe> one(One<ComponentTypes>::Dispatch({from.complex}, true));
+        EXPECT_EQ(one->First(), from.type);
         for (const Candidate& to : kCandidates) {
-            std::unique_ptr<IProbe> probe(Two::Dispatch({from.real, to.complex}, true));
-            EXPECT_EQ(probe->First(), from.type);
-            EXPECT_EQ(probe->Second(), to.type);
+            // A third descriptor is ignored by a two-position dispatch.
+            std::unique_ptr<IProbe> two(Two::Dispatch({from.real, to.complex, DataType()}, true));
+            EXPECT_EQ(two->First(), from.type);
+            EXPECT_EQ(two->Second(), to.type);
         }
     }
+    // Descriptors come from type traits, so other lists work, `long long` included.
+    using LongLong = TypeList<long long, NullDataType>;
+    std::unique_ptr<IProbe> custom(One<LongLong, LongLong>::Dispatch({DataType::Type64S}, false));
+    EXPECT_EQ(custom->First(), typeid(long long));
 }
 
-TEST(ExtendDispatchTypes, ExtraDescriptorsAreIgnored) {
-    std::unique_ptr<IProbe> probe(
-        Two::Dispatch({DataType::Type16S, DataType::Type32R, DataType()}, false));
-    EXPECT_EQ(probe->First(), typeid(short));
-    EXPECT_EQ(probe->Second(), typeid(float));
-}
-
-void ExpectInvalidType(const std::optional<kora::Exception>& failure) {
+void ExpectFailure(const std::optional<kora::Exception>& failure, const char* message,
+                   unsigned int line, const char* inFunction = "Dispatch") {
     ASSERT_TRUE(failure);
-    EXPECT_EQ(failure->GetMessage(), "Invalid type requested.");
+    EXPECT_EQ(failure->GetMessage(), message);
     EXPECT_EQ(failure->GetSourceFile(), "vrkframework/basic/core/typedispatch/extendtypedispatch");
-    EXPECT_EQ(failure->GetLine(), 175u);
-    EXPECT_NE(failure->GetFunction().find("Dispatch"), std::string::npos);
+    EXPECT_EQ(failure->GetLine(), line);
+    EXPECT_NE(failure->GetFunction().find(inFunction), std::string::npos) << failure->GetFunction();
+}
+
+constexpr char kInvalid[] = "Invalid type requested.";
+constexpr char kShort[] = "Not enough type in the vector for the dispatcher you are using.";
+
+template <class Action>
+std::optional<kora::Exception> Fails(Action action) {
+    return kubo_test::Catch<kora::Exception>(action);
 }
 
 TEST(ExtendDispatchTypes, UnmatchedDescriptorsAreInvalid) {
-    const DataType unmatched[] = {
-        DataType(),
-        DataType(32, true, true, 24, 8, false),  // 32R but for the mantissa
-        DataType(12, false, false, 12, 0, false),
-        DataType::Type1U,
-        DataType(128, true, true, 128, 0, false),
-    };
-    for (const DataType& type : unmatched) {
-        ExpectInvalidType(kubo_test::Catch<kora::Exception>([&] { One::Dispatch({type}, true); }));
+    for (const DataType& type : {DataType(), DataType(32, true, true, 24, 8, false),
+                                 DataType(12, false, false, 12, 0, false), DataType::Type1U}) {
+        ExpectFailure(Fails([&] { One<ComponentTypes>::Dispatch({type}, true); }), kInvalid, 175);
     }
-}
-
-TEST(ExtendDispatchTypes, ComplexDescriptorsNeedAcceptComplex) {
-    ExpectInvalidType(
-        kubo_test::Catch<kora::Exception>([] { One::Dispatch({DataType::TypeC16S}, false); }));
-    ExpectInvalidType(kubo_test::Catch<kora::Exception>([] {
-        Two::Dispatch({DataType::TypeC16S, DataType::Type8U}, false);
-    }));
-    ExpectInvalidType(kubo_test::Catch<kora::Exception>([] {
-        Two::Dispatch({DataType::Type8U, DataType::TypeC16S}, false);
-    }));
-}
-
-TEST(ExtendDispatchTypes, PositionOneIsResolvedFirst) {
-    // Both invalid: the failure comes from the two-position level, before position 0.
-    const auto both = kubo_test::Catch<kora::Exception>([] {
-        Two::Dispatch({DataType(), DataType()}, false);
-    });
-    ExpectInvalidType(both);
-    EXPECT_NE(both->GetFunction().find("N = 2"), std::string::npos) << both->GetFunction();
-    // Only position 0 invalid: it fails one level down.
-    const auto first = kubo_test::Catch<kora::Exception>([] {
-        Two::Dispatch({DataType(), DataType::Type8U}, false);
-    });
-    ExpectInvalidType(first);
-    EXPECT_NE(first->GetFunction().find("N = 1"), std::string::npos) << first->GetFunction();
-}
-
-void ExpectNotEnough(const std::optional<kora::Exception>& failure, unsigned int line) {
-    ASSERT_TRUE(failure);
-    EXPECT_EQ(failure->GetMessage(),
-              "Not enough type in the vector for the dispatcher you are using.");
-    EXPECT_EQ(failure->GetSourceFile(), "vrkframework/basic/core/typedispatch/extendtypedispatch");
-    EXPECT_EQ(failure->GetLine(), line);
+    // Complex descriptors match only when accepted, at either position.
+    ExpectFailure(Fails([] { One<ComponentTypes>::Dispatch({DataType::TypeC16S}, false); }),
+                  kInvalid, 175);
+    ExpectFailure(Fails([] {
+                      Two::Dispatch({DataType::Type8U, DataType::TypeC16S}, false);
+                  }),
+                  kInvalid, 175);
+    // Position 1 is resolved first: with both invalid the two-position level fails.
+    ExpectFailure(Fails([] {
+                      Two::Dispatch({DataType(), DataType()}, false);
+                  }),
+                  kInvalid, 175, "N = 2");
+    ExpectFailure(Fails([] {
+                      Two::Dispatch({DataType(), DataType::Type8U}, false);
+                  }),
+                  kInvalid, 175, "N = 1");
 }
 
 TEST(ExtendDispatchTypes, ShortVectorsAreRejected) {
-    ExpectNotEnough(kubo_test::Catch<kora::Exception>([] { One::Dispatch({}, true); }), 114);
-    ExpectNotEnough(kubo_test::Catch<kora::Exception>([] { Two::Dispatch({}, true); }), 114);
-    ExpectNotEnough(
-        kubo_test::Catch<kora::Exception>([] { Two::Dispatch({DataType::Type8U}, true); }), 114);
-}
-
-TEST(ExtendDispatchTypes, ShortVectorAtTheLastCandidateReportsItsOwnLine) {
-    using LastOnly = kora::typedispatch::ExtendDispatchTypes<
-        kora::typedispatch::Factory1Template<OneProbe, IProbe>, 1, ComponentTypes,
-        TypeList<std::uint64_t, NullDataType>, NullDataType>;
-    ExpectNotEnough(kubo_test::Catch<kora::Exception>([] { LastOnly::Dispatch({}, false); }), 163);
-    std::unique_ptr<IProbe> probe(LastOnly::Dispatch({DataType::Type64U}, false));
-    EXPECT_EQ(probe->First(), typeid(std::uint64_t));
-    ExpectInvalidType(
-        kubo_test::Catch<kora::Exception>([] { LastOnly::Dispatch({DataType::Type8U}, false); }));
-}
-
-TEST(ExtendDispatchTypes, CandidateListsAreOpenToOtherTypes) {
-    // Descriptors come from type traits, so `long long` is a 64-bit signed candidate.
-    using Custom = kora::typedispatch::ExtendDispatchTypes<
-        kora::typedispatch::Factory1Template<OneProbe, IProbe>, 1,
-        TypeList<long long, NullDataType>, TypeList<long long, NullDataType>, NullDataType>;
-    std::unique_ptr<IProbe> probe(Custom::Dispatch({DataType::TypeC64S}, true));
-    EXPECT_EQ(probe->First(), typeid(long long));
+    ExpectFailure(Fails([] { One<ComponentTypes>::Dispatch({}, true); }), kShort, 114);
+    ExpectFailure(Fails([] { Two::Dispatch({DataType::Type8U}, true); }), kShort, 114);
+    // Found where only the last candidate is left, the failure reports its own line.
+    using LastOnly = One<TypeList<std::uint64_t, NullDataType>>;
+    ExpectFailure(Fails([] { LastOnly::Dispatch({}, false); }), kShort, 163);
+    ExpectFailure(Fails([] { LastOnly::Dispatch({DataType::Type8U}, false); }), kInvalid, 175);
 }
 
 }  // namespace

@@ -40,8 +40,11 @@ struct Factory2Template {
 
 namespace detail {
 
-/// Reports a vector with fewer descriptors than positions (kora::Exception).
-[[noreturn]] KUBO_API void ThrowNotEnoughTypes(unsigned int line, const char* function);
+/// Returns types[position]; a vector too short for it is reported (kora::Exception) at
+/// `shortLine`. Out of line, so no caller's compiler sees an index past a short literal list.
+KUBO_API const kora::kubo::DataType& DescriptorAt(const std::vector<kora::kubo::DataType>& types,
+                                                  std::size_t position, unsigned int shortLine,
+                                                  const char* function);
 /// Reports a descriptor that matches no candidate (kora::Exception, line 175).
 [[noreturn]] KUBO_API void ThrowInvalidType(const char* function);
 
@@ -87,11 +90,10 @@ struct ExtendDispatchTypes<Factory, N, FullList, typeconv::priv::TypeList<Head, 
     static typename Factory::Interface* Dispatch(const std::vector<kora::kubo::DataType>& types,
                                                  bool acceptComplex) {
         constexpr bool kLastCandidate = std::is_same_v<Tail, typeconv::priv::NullDataType>;
-        if (types.size() < static_cast<std::size_t>(N)) {
-            detail::ThrowNotEnoughTypes(kLastCandidate ? 163u : 114u,
-                                        KUBO_DETAIL_DISPATCH_SIGNATURE);
-        }
-        if (detail::Matches<Head>(types[static_cast<std::size_t>(N - 1)], acceptComplex)) {
+        const kora::kubo::DataType& type =
+            detail::DescriptorAt(types, static_cast<std::size_t>(N - 1),
+                                 kLastCandidate ? 163u : 114u, KUBO_DETAIL_DISPATCH_SIGNATURE);
+        if (detail::Matches<Head>(type, acceptComplex)) {
             using NowChosen = typeconv::priv::TypeList<Head, Chosen>;
             if constexpr (N == 1) {
                 return detail::CreateChosen<Factory, NowChosen>::Create();

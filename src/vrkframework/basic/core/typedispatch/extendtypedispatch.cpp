@@ -10,9 +10,14 @@ constexpr char kSourcePath[] = "vrkframework/basic/core/typedispatch/extendtyped
 
 }  // namespace
 
-void ThrowNotEnoughTypes(unsigned int line, const char* function) {
-    throw kora::Exception("Not enough type in the vector for the dispatcher you are using.",
-                          kSourcePath, function, line);
+const kora::kubo::DataType& DescriptorAt(const std::vector<kora::kubo::DataType>& types,
+                                         std::size_t position, unsigned int shortLine,
+                                         const char* function) {
+    if (types.size() <= position) {
+        throw kora::Exception("Not enough type in the vector for the dispatcher you are using.",
+                              kSourcePath, function, shortLine);
+    }
+    return types[position];
 }
 
 void ThrowInvalidType(const char* function) {
