@@ -1,118 +1,145 @@
+// Masks, their bit layout, and masks of explicit coordinates. A Mask packs flags with the
+// library's loop (its fastest clone on this machine); PackFlags called here is this program's
+// baseline copy.
 #include "vrkframework/basic/kubo/masks/mask.h"
 
 #include <gtest/gtest.h>
 
-#include <cstring>
+#include <algorithm>
+#include <climits>
+#include <memory>
+#include <tuple>
+#include <utility>
 #include <vector>
+
+#include "vrkframework/basic/kubo/masks/coordinatemaskbuilder.h"
+#include "vrkframework/basic/kubo/masks/flagpacking.h"
+#include "vrkframework/basic/kubo/raster/raster.h"
 
 namespace {
 
-using kora::kubo::DataType;
-using kora::kubo::Mask;
-using kora::kubo::RasterContext;
-using kora::kubo::RasterInfo;
+using namespace kora::kubo;
+using Bytes = std::vector<unsigned char>;
+using Pairs = std::vector<std::pair<int, int>>;
 
-std::vector<unsigned char> BytesOf(const Mask& mask) {
-    return std::vector<unsigned char>(mask.GetBits(), mask.GetBits() + mask.GetByteCount());
+Bytes BytesOf(const Mask& mask) {
+    return Bytes(mask.GetBits(), mask.GetBits() + mask.GetByteCount());
+}
+
+// A heap copy for a mask to take over.
+unsigned char* Handed(const Bytes& bytes) {
+    auto* copy = new unsigned char[bytes.size()];
+    std::copy(bytes.begin(), bytes.end(), copy);
+    return copy;
 }
 
 TEST(Mask, DescribesOneBitPerPixelOfTheFullExtentAllBackground) {
     const Mask mask(RasterInfo(3, 1, 4, DataType::TypeC32R), RasterContext(2, 1, 7, 9));
-    EXPECT_EQ(mask.width, 3u);
-    EXPECT_EQ(mask.height, 1u);
-    EXPECT_EQ(mask.channels, 1u);
+    EXPECT_EQ(std::make_tuple(mask.width, mask.height, mask.channels, mask.xMargin, mask.yMargin,
+                              mask.xOffset, mask.yOffset),
+              std::make_tuple(3u, 1u, 1u, 2u, 1u, 7u, 9u));
     EXPECT_EQ(mask.dataType, DataType::Type1U);
-    EXPECT_EQ(mask.xMargin, 2u);
-    EXPECT_EQ(mask.yMargin, 1u);
-    EXPECT_EQ(mask.xOffset, 7u);
-    EXPECT_EQ(mask.yOffset, 9u);
-    EXPECT_EQ(mask.GetFullWidth(), 7);
-    EXPECT_EQ(mask.GetFullHeight(), 3);
-    EXPECT_EQ(mask.GetBitCount(), 21u);
-    EXPECT_EQ(mask.GetByteCount(), 3u);
-    EXPECT_EQ(BytesOf(mask), (std::vector<unsigned char>{0, 0, 0}));
-    for (unsigned int i = 0; i < 24; ++i) {
-        EXPECT_FALSE(mask.GetBit(i));
+    EXPECT_EQ(std::make_tuple(mask.GetFullWidth(), mask.GetFullHeight(), mask.GetBitCount()),
+              std::make_tuple(7, 3, 21u));
+    EXPECT_EQ(BytesOf(mask), Bytes(3, 0));
+}
+
+// Bit r x fullWidth + c is pixel (r, c), most significant bit first, rows not padded, any
+// non-zero flag valid, the bits past the last pixel 0. A buffer handed over is released
+// (the sanitizer build sees a double or missing release).
+TEST(Mask, PacksFlagsOrCopiesPackedBytes) {
+    struct Case {
+        RasterInfo info;
+        RasterContext context;
+        Bytes flags;
+        Bytes bytes;
+    };
+    const Case cases[] = {
+        {RasterInfo(3, 1, 1, DataType::Type8U), RasterContext(), {1, 0, 1}, {0xa0}},
+        // A 5 x 3 extent: the second row starts at bit 5 of byte 0.
+        {RasterInfo(3, 1, 1, DataType::Type16U),
+         RasterContext(1, 1, 0, 0),
+         {61, 0, 0, 1, 0, 0, 121, 0, 0, 1, 0, 0, 181, 0, 0xff},
+         {0x92, 0x4a}},
+        {RasterInfo(0, 5, 1, DataType::Type8U), RasterContext(), {1}, {}},
+    };
+    for (const Case& c : cases) {
+        Bytes flags = c.flags;
+        const Mask mask(c.info, c.context, flags.data(), false, false);
+        EXPECT_EQ(BytesOf(mask), c.bytes);
+        for (unsigned int i = 0; i < mask.GetBitCount() + 9; ++i) {
+            EXPECT_EQ(mask.GetBit(i), i < mask.GetBitCount() && c.flags[i] != 0) << i;
+        }
+        EXPECT_EQ(BytesOf(Mask(c.info, c.context, Handed(c.flags), true, false)), c.bytes);
+        Bytes packed = c.bytes;
+        packed.push_back(0x77);  // only the byte count is copied
+        EXPECT_EQ(BytesOf(Mask(c.info, c.context, Handed(packed), true, true)), c.bytes);
+        EXPECT_EQ(BytesOf(Mask(c.info, c.context, nullptr, true, false)), Bytes(c.bytes.size()));
     }
 }
 
-TEST(Mask, AnEmptyExtentHasNoBytes) {
-    const Mask mask(RasterInfo(0, 5, 1, DataType::Type8U), RasterContext());
-    EXPECT_EQ(mask.GetBitCount(), 0u);
-    EXPECT_EQ(mask.GetByteCount(), 0u);
-    unsigned char flag = 1;
-    const Mask fromFlags(RasterInfo(0, 5, 1, DataType::Type8U), RasterContext(), &flag, false,
-                         false);
-    EXPECT_EQ(fromFlags.GetByteCount(), 0u);
-    EXPECT_FALSE(fromFlags.GetBit(0));
-}
-
-TEST(Mask, ThreeFlagsPackIntoTheHighBitsOfOneByte) {
-    unsigned char flags[3] = {1, 0, 1};
-    const Mask mask(RasterInfo(3, 1, 1, DataType::Type8U), RasterContext(), flags, false, false);
-    EXPECT_EQ(mask.GetBitCount(), 3u);
-    EXPECT_EQ(BytesOf(mask), std::vector<unsigned char>{0xa0});
-}
-
-// Rows are not padded: with a full width of 5 the second row starts at bit 5 of byte 0.
-TEST(Mask, FlagBitsRunOnAcrossRowEndsMostSignificantBitFirst) {
-    const RasterInfo info(3, 1, 1, DataType::Type16U);
-    const RasterContext context(1, 1, 0, 0);  // full extent 5 x 3
-    std::vector<unsigned char> flags(15);
-    for (unsigned int i = 0; i < 15; ++i) {
-        flags[i] = (i % 3 == 0 || i == 14) ? static_cast<unsigned char>(1 + 60 * (i % 5)) : 0;
-    }
-    const Mask mask(info, context, flags.data(), false, false);
-    // Bits 0, 3, 6, 9, 12, 14 set: 1001 0010 | 0100 1010.
-    EXPECT_EQ(BytesOf(mask), (std::vector<unsigned char>{0x92, 0x4a}));
-    for (unsigned int i = 0; i < 16; ++i) {
-        EXPECT_EQ(mask.GetBit(i), i < 15 && flags[i] != 0) << i;
+// Vector bodies and tails of both packing loops.
+TEST(Mask, LibraryAndBaselineLoopsPackEveryLength) {
+    for (const unsigned int count : {1u, 7u, 8u, 9u, 17u, 1003u}) {
+        Bytes flags(count);
+        Bytes expected((count + 7) / 8);
+        for (unsigned int i = 0; i < count; ++i) {
+            const unsigned char values[] = {0, 1, 0x80, 0xff, 0, 2, 0, 0, 7};
+            flags[i] = values[(i * 5) % 9];
+            expected[i / 8] |= static_cast<unsigned char>(flags[i] != 0 ? 128u >> (i % 8) : 0u);
+        }
+        const Mask mask(RasterInfo(count, 1, 1, DataType::Type8U), RasterContext(), flags.data(),
+                        false, false);
+        EXPECT_EQ(BytesOf(mask), expected) << count;
+        Bytes bits(expected.size() + 1, 0xcd);
+        detail::PackFlags(flags.data(), bits.data(), count);
+        EXPECT_EQ(bits.back(), 0xcd) << "written past the end";
+        bits.pop_back();
+        EXPECT_EQ(bits, expected) << count;
     }
 }
 
-TEST(Mask, PackedBytesAreCopiedAsTheyAre) {
-    unsigned char bits[3] = {0x5a, 0xff, 0x77};
-    const Mask mask(RasterInfo(5, 3, 1, DataType::Type8U), RasterContext(), bits, false, true);
-    EXPECT_EQ(mask.GetByteCount(), 2u);
-    EXPECT_EQ(BytesOf(mask), (std::vector<unsigned char>{0x5a, 0xff}));
-    EXPECT_TRUE(mask.GetBit(14));
-    EXPECT_FALSE(mask.GetBit(15));  // past the last pixel
+CoordinateMaskBuilder BuilderOf(const Pairs& coordinates) {
+    CoordinateMaskBuilder builder;
+    for (const auto& [row, column] : coordinates) {
+        builder.AddValidCoordinate(row, column);
+    }
+    return builder;
 }
 
-// The checkers of the sanitizer build see a buffer released twice or never.
-TEST(Mask, ReleasesTheBufferOnlyWhenAskedTo) {
-    auto* owned = new unsigned char[4]{1, 1, 0, 1};
-    const Mask fromOwned(RasterInfo(4, 1, 1, DataType::Type8U), RasterContext(), owned, true,
-                         false);
-    EXPECT_EQ(BytesOf(fromOwned), std::vector<unsigned char>{0xd0});
-    auto* packed = new unsigned char[1]{0xc0};
-    const Mask fromPacked(RasterInfo(4, 1, 1, DataType::Type8U), RasterContext(), packed, true,
-                          true);
-    EXPECT_EQ(BytesOf(fromPacked), std::vector<unsigned char>{0xc0});
-    unsigned char kept[4] = {0, 1, 0, 0};
-    const Mask fromKept(RasterInfo(4, 1, 1, DataType::Type8U), RasterContext(), kept, false, false);
-    EXPECT_EQ(kept[1], 1);
-    EXPECT_EQ(BytesOf(fromKept), std::vector<unsigned char>{0x40});
+TEST(CoordinateMaskBuilder, KeepsCoordinatesSortedByRowThenColumnWithoutDuplicates) {
+    EXPECT_EQ(BuilderOf({{5, 1}, {2, 9}, {5, 0}, {2, 9}, {-1, 3}, {5, 1}}).GetCoordinates(),
+              (Pairs{{-1, 3}, {2, 9}, {5, 0}, {5, 1}}));
 }
 
-TEST(Mask, NoBufferLeavesEveryPixelBackground) {
-    const Mask mask(RasterInfo(9, 2, 1, DataType::Type8U), RasterContext(), nullptr, true, false);
-    EXPECT_EQ(BytesOf(mask), (std::vector<unsigned char>{0, 0, 0}));
-}
-
-TEST(Mask, CopiesOwnTheirBits) {
-    unsigned char flags[4] = {1, 0, 0, 0};
-    Mask original(RasterInfo(2, 2, 1, DataType::Type8U), RasterContext(0, 0, 3, 4), flags, false,
-                  false);
-    const Mask copy(original);
-    Mask assigned(RasterInfo(1, 1, 1, DataType::Type8U), RasterContext());
-    assigned = original;
-    original.GetBits()[0] = 0x30;
-    EXPECT_EQ(BytesOf(copy), std::vector<unsigned char>{0x80});
-    EXPECT_EQ(BytesOf(assigned), std::vector<unsigned char>{0x80});
-    EXPECT_EQ(assigned.GetFullWidth(), 2);
-    EXPECT_EQ(assigned.xOffset, 3u);
-    EXPECT_TRUE(original.GetBit(2));
+// Coordinates are in the frame of the whole image, offsets compared as signed 32-bit values;
+// margins shift the bits and are never set themselves.
+TEST(CoordinateMaskBuilder, SetsTheCoordinatesInsideTheImageProper) {
+    struct Case {
+        RasterInfo info;
+        RasterContext context;
+        Pairs coordinates;
+        Bytes bytes;
+    };
+    const Case cases[] = {
+        {RasterInfo(5, 4, 3, DataType::Type16S), RasterContext(1, 1, 0, 0), {}, Bytes(6, 0)},
+        {RasterInfo(3, 1, 1, DataType::Type8U), RasterContext(), {{0, 2}, {0, 0}}, {0xa0}},
+        // 4 x 3 at column 100, row 50, margins 2 and 1: bits 10, 20 and 29 of 8 x 5.
+        {RasterInfo(4, 3, 1, DataType::Type8U),
+         RasterContext(2, 1, 100, 50),
+         {{50, 100}, {52, 103}, {49, 100}, {50, 99}, {53, 100}, {50, 104}, {51, 102}},
+         {0, 0x20, 0x08, 0x04, 0}},
+        // Column offset -1; the last rows end at the end of the int range.
+        {RasterInfo(2, 5, 1, DataType::Type8U),
+         RasterContext(0, 0, 4294967295u, static_cast<unsigned int>(INT_MAX - 1)),
+         {{INT_MAX - 1, -1}, {INT_MAX, 0}, {INT_MAX, 1}},
+         {0x90, 0}},
+    };
+    for (const Case& c : cases) {
+        const Raster raster(c.info, c.context);
+        EXPECT_EQ(BytesOf(*std::unique_ptr<Mask>(BuilderOf(c.coordinates).BuildMask(raster))),
+                  c.bytes);
+    }
 }
 
 }  // namespace

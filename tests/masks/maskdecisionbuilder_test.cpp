@@ -1,9 +1,13 @@
+// No-data decisions and the masks their builders derive from pixel values.
 #include "vrkframework/basic/kubo/masks/maskdecisionbuilder.h"
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdint>
 #include <memory>
+#include <tuple>
+#include <utility>
 #include <vector>
 
 #include "vrkframework/basic/kubo/masks/mask.h"
@@ -13,222 +17,235 @@
 
 namespace {
 
-using kora::kubo::BkgdAllChans;
-using kora::kubo::BkgdAnyChan;
-using kora::kubo::BkgdRule;
-using kora::kubo::DataType;
-using kora::kubo::IMaskDecision;
-using kora::kubo::Mask;
-using kora::kubo::MaskDecision;
-using kora::kubo::MaskDecisionBuilder;
-using kora::kubo::Raster;
-using kora::kubo::RasterContext;
-using kora::kubo::RasterInfo;
+using namespace kora::kubo;
+using Flags = std::vector<unsigned char>;
+
+// The no-data values, channels, rule, whether they are final, and whether a kernel is made.
+using Fields = std::tuple<std::vector<double>, std::vector<unsigned int>, BkgdRule, bool, bool>;
+
+Fields FieldsOf(const MaskDecision& decision) {
+    return {decision.GetNoData(), decision.GetChannels(), decision.GetRule(), decision.IsExpanded(),
+            decision.GetImpl() != nullptr};
+}
+
+template <class K>
+bool Is(const IMaskDecisionImpl* kernel) {
+    return dynamic_cast<const K*>(kernel) != nullptr;
+}
 
 const MaskDecision& DecisionOf(const MaskDecisionBuilder& builder) {
     return dynamic_cast<const MaskDecision&>(*builder.GetDecision());
 }
 
-// Pixel-interleaved 8-bit raster from its samples, margins included.
-Raster ByteRaster(const RasterInfo& info, const RasterContext& context,
-                  const std::vector<unsigned char>& samples) {
+// A raster whose bytes count up from 0, margins included.
+Raster CountingRaster(const RasterInfo& info, const RasterContext& context) {
     Raster raster(info, context);
-    EXPECT_EQ(raster.byteSize, samples.size());
-    std::copy(samples.begin(), samples.end(), raster.data);
+    for (std::size_t i = 0; i < raster.byteSize; ++i) {
+        raster.data[i] = static_cast<unsigned char>(i);
+    }
     return raster;
 }
 
-std::vector<bool> BitsOf(const Mask& mask) {
-    std::vector<bool> bits;
+Flags BitsOf(const Mask& mask) {
+    Flags bits;
     for (unsigned int i = 0; i < mask.GetBitCount(); ++i) {
-        bits.push_back(mask.GetBit(i));
+        bits.push_back(mask.GetBit(i) ? 1 : 0);
     }
     return bits;
 }
 
-TEST(MaskDecisionBuilder, FromARasterDescriptionTestsEveryChannelAgainstOneValueAtOnce) {
-    const RasterInfo info(2, 2, 3, DataType::Type8U);
-    const MaskDecisionBuilder builder(info, 5.0);
-    const MaskDecision& decision = DecisionOf(builder);
-    EXPECT_EQ(decision.GetRule(), BkgdAnyChan);
-    EXPECT_EQ(decision.GetNoData(), (std::vector<double>{5, 5, 5}));
+TEST(MaskDecision, WidensASingleValueToTheFirstRastersChannelsForGood) {
+    MaskDecision decision(BkgdAnyChan, {4}, {}, false);
+    const unsigned char valid[5] = {1, 2, 3, 4, 4};
+    const unsigned char background[3] = {1, 4, 1};
+    EXPECT_EQ(decision.IsValid(valid), 0);  // no kernel yet: background
+    decision.Update(RasterInfo(10, 10, 3, DataType::Type8U));
+    EXPECT_EQ(FieldsOf(decision), (Fields{{4, 4, 4}, {1, 2, 3}, BkgdAnyChan, true, true}));
+    EXPECT_EQ(decision.IsValid(valid), 1);
+    EXPECT_EQ(decision.IsValid(background), 0);
+    // More channels later: the three listed ones stay the only ones tested.
+    decision.Update(RasterInfo(10, 10, 5, DataType::Type8U));
     EXPECT_EQ(decision.GetChannels(), (std::vector<unsigned int>{1, 2, 3}));
-    EXPECT_NE(dynamic_cast<const SameNoDataAnyChanMaskImpl<unsigned char>*>(decision.GetImpl()),
-              nullptr);
-    const Raster raster = ByteRaster(info, RasterContext(), {5, 1, 1, 1, 5, 1, 1, 1, 1, 1, 1, 5});
-    const std::unique_ptr<Mask> mask(builder.BuildMask(raster));
-    EXPECT_EQ(BitsOf(*mask), (std::vector<bool>{false, false, true, false}));
+    EXPECT_EQ(decision.IsValid(valid), 1);
+    // Without a value there is nothing to widen and nothing to test.
+    MaskDecision empty(BkgdAllChans, {}, {}, false);
+    empty.Update(RasterInfo(1, 1, 3, DataType::Type32R));
+    EXPECT_EQ(FieldsOf(empty), (Fields{{}, {}, BkgdAllChans, false, true}));
+    EXPECT_EQ(empty.IsValid(background), 1);
 }
 
-TEST(MaskDecisionBuilder, OneValueAndARuleBindToTheFirstRasterForGood) {
-    const MaskDecisionBuilder builder(0.0, BkgdAllChans);
-    EXPECT_EQ(DecisionOf(builder).GetImpl(), nullptr);
-    EXPECT_EQ(DecisionOf(builder).GetNoData(), std::vector<double>{0});
-    EXPECT_TRUE(DecisionOf(builder).GetChannels().empty());
-    const std::unique_ptr<Mask> first(builder.BuildMask(
-        ByteRaster(RasterInfo(2, 1, 1, DataType::Type8U), RasterContext(), {0, 3})));
-    EXPECT_EQ(BitsOf(*first), (std::vector<bool>{false, true}));
-    // The lists now name channel 1 only, also for a three-channel raster.
-    const std::unique_ptr<Mask> second(builder.BuildMask(
-        ByteRaster(RasterInfo(2, 1, 3, DataType::Type8U), RasterContext(), {0, 4, 4, 1, 0, 0})));
-    EXPECT_EQ(BitsOf(*second), (std::vector<bool>{false, true}));
-    EXPECT_EQ(DecisionOf(builder).GetChannels(), std::vector<unsigned int>{1});
-}
-
-TEST(MaskDecisionBuilder, OneValueForListedChannels) {
-    const MaskDecisionBuilder builder(9.0, BkgdAnyChan, {2, 3});
-    const MaskDecision& decision = DecisionOf(builder);
-    EXPECT_EQ(decision.GetNoData(), (std::vector<double>{9, 9}));
-    EXPECT_EQ(decision.GetChannels(), (std::vector<unsigned int>{2, 3}));
-    EXPECT_TRUE(decision.IsExpanded());
+// The kernel follows the sample type and channel count, not the size; a sample type without
+// a kernel leaves none, and every pixel background.
+TEST(MaskDecision, RebuildsItsKernelOnlyForAnotherTypeOrChannelCount) {
+    MaskDecision decision(BkgdAnyChan, {0}, {}, false);
+    decision.Update(RasterInfo(4, 4, 2, DataType::Type16U));
+    const IMaskDecisionImpl* first = decision.GetImpl();
+    decision.Update(RasterInfo(400, 1, 2, DataType::Type16U));
+    EXPECT_EQ(decision.GetImpl(), first);
+    decision.Update(RasterInfo(4, 4, 2, DataType::TypeC16U));
+    EXPECT_TRUE(Is<SameNoDataChanPairsMaskImpl<unsigned short>>(decision.GetImpl()));
+    decision.Update(RasterInfo(4, 4, 1, DataType::Type16U));
+    EXPECT_TRUE(Is<SingleChannelNoDataMaskImpl<unsigned short>>(decision.GetImpl()));
+    const Raster raster = CountingRaster(RasterInfo(2, 1, 1, DataType::Type1U), RasterContext());
+    Flags flags(2, 9);
+    decision.Evaluate(raster, flags.data());
     EXPECT_EQ(decision.GetImpl(), nullptr);
-    const std::unique_ptr<Mask> mask(builder.BuildMask(ByteRaster(
-        RasterInfo(3, 1, 3, DataType::Type8U), RasterContext(), {9, 1, 1, 1, 9, 1, 1, 1, 9})));
-    EXPECT_EQ(BitsOf(*mask), (std::vector<bool>{true, false, false}));
+    EXPECT_EQ(flags, Flags(2, 0));
 }
 
-TEST(MaskDecisionBuilder, AnEmptyChannelListMarksEveryPixelValidAtOnce) {
-    const MaskDecisionBuilder builder(9.0, BkgdAllChans, {});
-    EXPECT_NE(dynamic_cast<const DummyNoDataMaskImpl*>(DecisionOf(builder).GetImpl()), nullptr);
-    const std::unique_ptr<Mask> mask(builder.BuildMask(ByteRaster(
-        RasterInfo(2, 1, 1, DataType::Type8U), RasterContext(1, 0, 0, 0), {9, 9, 9, 9})));
-    EXPECT_EQ(BitsOf(*mask), std::vector<bool>(4, true));
+// Pixels whose samples would lie past the buffer (four values by position on three channels
+// read four samples a pixel) are background, unread.
+TEST(MaskDecision, NeverReadsPastTheRastersBuffer) {
+    Flags flags(4, 0xab);
+    const Raster raster = CountingRaster(RasterInfo(4, 1, 3, DataType::Type8U), RasterContext());
+    MaskDecision(BkgdAnyChan, {100, 100, 100, 7}, {1, 2, 3, 4}, true)
+        .Evaluate(raster, flags.data());
+    EXPECT_EQ(flags, (Flags{1, 0, 1, 0}));  // samples 0-3, 4-7 (7 matches), 8-11, none left
+    Raster unallocated;
+    unallocated.width = 3;
+    unallocated.height = 1;
+    unallocated.channels = 1;
+    unallocated.dataType = DataType::Type8U;
+    MaskDecision single(BkgdAnyChan, {0}, {}, false);
+    single.Evaluate(unallocated, flags.data());
+    EXPECT_EQ(flags, (Flags{0, 0, 0, 0}));
+    MaskDecision nothing(BkgdAnyChan, {0}, {}, true);
+    nothing.Evaluate(unallocated, flags.data());
+    EXPECT_EQ(flags, (Flags{1, 1, 1, 0}));
 }
 
-TEST(MaskDecisionBuilder, ValuesByChannelInOrderOrAsListed) {
-    const MaskDecisionBuilder inOrder(std::vector<double>{1, 2}, BkgdAllChans);
-    EXPECT_EQ(DecisionOf(inOrder).GetChannels(), (std::vector<unsigned int>{1, 2}));
-    EXPECT_EQ(DecisionOf(inOrder).GetNoData(), (std::vector<double>{1, 2}));
-    EXPECT_TRUE(DecisionOf(inOrder).IsExpanded());
-    const Raster raster =
-        ByteRaster(RasterInfo(3, 1, 2, DataType::Type8U), RasterContext(), {1, 2, 2, 1, 1, 1});
-    EXPECT_EQ(BitsOf(*std::unique_ptr<Mask>(inOrder.BuildMask(raster))),
-              (std::vector<bool>{false, true, true}));
-    // A list naming every channel is applied by position, whatever numbers it holds.
-    const MaskDecisionBuilder full(std::vector<double>{1, 2}, BkgdAllChans, {2, 1});
-    EXPECT_EQ(DecisionOf(full).GetChannels(), (std::vector<unsigned int>{2, 1}));
-    EXPECT_EQ(BitsOf(*std::unique_ptr<Mask>(full.BuildMask(raster))),
-              (std::vector<bool>{false, true, true}));
-    // A shorter one addresses channels: 1 for channel 2, 2 for channel 1, channel 3 untested.
-    const Raster three = ByteRaster(RasterInfo(3, 1, 3, DataType::Type8U), RasterContext(),
-                                    {2, 1, 9, 1, 2, 9, 2, 1, 0});
-    EXPECT_EQ(BitsOf(*std::unique_ptr<Mask>(full.BuildMask(three))),
-              (std::vector<bool>{false, true, false}));
+// Clones and copies hold equal fields and a kernel of their own.
+TEST(MaskDecision, ClonesAndCopiesAreIndependentEquals) {
+    MaskDecision decision(BkgdChanPairs, {3, 0}, {1, 2}, true);
+    const std::unique_ptr<IMaskDecision> unbound(decision.Clone());
+    EXPECT_EQ(dynamic_cast<const MaskDecision&>(*unbound).GetImpl(), nullptr);
+    decision.Update(RasterInfo(2, 2, 2, DataType::Type32S));
+    const std::unique_ptr<IMaskDecision> clone(decision.Clone());
+    MaskDecision copy(decision);
+    MaskDecision assigned(BkgdAnyChan, {}, {}, false);
+    assigned = decision;
+    const int pixel[2] = {3, 0};
+    for (MaskDecision* other : {&dynamic_cast<MaskDecision&>(*clone), &copy, &assigned}) {
+        EXPECT_EQ(FieldsOf(*other), FieldsOf(decision));
+        EXPECT_NE(other->GetImpl(), decision.GetImpl());
+        EXPECT_EQ(other->IsValid(pixel), 0);
+    }
 }
 
-// A decision of the client's own: the builder evaluates it over the whole extent at once.
-class EveryThirdPixel : public IMaskDecision {
-public:
-    explicit EveryThirdPixel(int* alive) : m_alive(alive) { ++*m_alive; }
-    EveryThirdPixel(const EveryThirdPixel& other) : IMaskDecision(other), m_alive(other.m_alive) {
-        ++*m_alive;
-    }
-    EveryThirdPixel& operator=(const EveryThirdPixel&) = delete;
-    ~EveryThirdPixel() override { --*m_alive; }
-    void Evaluate(const void*, unsigned char* flags, std::size_t count) override {
-        for (std::size_t i = 0; i < count; ++i) {
-            flags[i] = i % 3 == 0 ? 1 : 0;
-        }
-    }
-    void Evaluate(const Raster& raster, unsigned char* flags) override {
-        Evaluate(raster.data, flags, std::size_t{raster.lineStride} * raster.bufferHeight);
-    }
-    unsigned char IsValid(const void*) override { return 1; }
-    IMaskDecision* Clone() const override { return new EveryThirdPixel(*this); }
-
-private:
-    int* m_alive;
-};
-
-TEST(MaskDecisionBuilder, UsesACloneOfAGivenDecisionOverTheWholeExtent) {
-    int alive = 0;
-    const EveryThirdPixel decision(&alive);
-    {
-        const MaskDecisionBuilder builder(&decision);
-        EXPECT_EQ(alive, 2);
-        EXPECT_NE(builder.GetDecision(), &decision);
-        const Raster raster(RasterInfo(2, 1, 1, DataType::Type8U), RasterContext(1, 1, 0, 0));
-        const std::unique_ptr<Mask> mask(builder.BuildMask(raster));
-        std::vector<bool> expected(12);
-        for (std::size_t i = 0; i < 12; ++i) {
-            expected[i] = i % 3 == 0;
-        }
-        EXPECT_EQ(BitsOf(*mask), expected);
-    }
-    EXPECT_EQ(alive, 1);
-}
-
-TEST(MaskDecisionBuilder, WithoutADecisionEveryPixelIsBackground) {
-    const MaskDecisionBuilder builder(nullptr);
-    EXPECT_EQ(builder.GetDecision(), nullptr);
-    const std::unique_ptr<Mask> mask(builder.BuildMask(
-        ByteRaster(RasterInfo(2, 1, 1, DataType::Type8U), RasterContext(), {1, 2})));
-    EXPECT_EQ(BitsOf(*mask), (std::vector<bool>{false, false}));
-}
-
-// Copies share one decision; each is released once, by the last builder holding it.
-TEST(MaskDecisionBuilder, CopiesShareOneDecisionReleasedByItsLastHolder) {
-    int alive = 0;
-    const EveryThirdPixel prototype(&alive);
-    {
-        const MaskDecisionBuilder original(&prototype);
-        MaskDecisionBuilder copy(original);
-        EXPECT_EQ(copy.GetDecision(), original.GetDecision());
-        MaskDecisionBuilder other(&prototype);
-        EXPECT_EQ(alive, 3);
-        other = original;
-        EXPECT_EQ(other.GetDecision(), original.GetDecision());
-        EXPECT_EQ(alive, 2);
-        copy = MaskDecisionBuilder(0.0, BkgdAnyChan);
-        EXPECT_EQ(alive, 2);
-    }
-    EXPECT_EQ(alive, 1);
-
-    // What one copy binds, the others see.
-    const MaskDecisionBuilder lazy(3.0, BkgdAnyChan);
-    const MaskDecisionBuilder shared(lazy);
-    delete lazy.BuildMask(Raster(RasterInfo(1, 1, 2, DataType::Type16S), RasterContext()));
-    EXPECT_EQ(DecisionOf(shared).GetChannels(), (std::vector<unsigned int>{1, 2}));
-}
-
-// Pieces of the extent are flagged and packed one after another; the mask equals the
-// decision's whole-raster flags, margins included, for every element type and rule.
-TEST(MaskDecisionBuilder, MasksMatchTheWholeRasterFlagsMarginsIncluded) {
-    const RasterInfo info(101, 97, 2, DataType::Type16U);
-    const RasterContext context(3, 2, 5, 6);  // 107 x 101 = 10807 pixels, several pieces
-    Raster raster(info, context);
-    auto* samples = reinterpret_cast<unsigned short*>(raster.data);
-    std::uint32_t state = 1;
-    for (std::size_t i = 0; i < raster.byteSize / 2; ++i) {
-        state = state * 1103515245u + 12345u;
-        samples[i] = static_cast<unsigned short>((state >> 16) % 3);
-    }
-    for (const BkgdRule rule : {BkgdAllChans, BkgdAnyChan, kora::kubo::BkgdChanPairs}) {
-        const MaskDecisionBuilder builder(std::vector<double>{0, 1}, rule);
-        const std::unique_ptr<Mask> mask(builder.BuildMask(raster));
-        ASSERT_EQ(mask->GetBitCount(), 10807u);
-        EXPECT_EQ(mask->xOffset, 5u);
-        MaskDecision decision(rule, {0, 1}, {1, 2}, true);
-        std::vector<unsigned char> flags(10807);
-        decision.Evaluate(raster, flags.data());
-        std::size_t valid = 0;
-        for (unsigned int i = 0; i < 10807; ++i) {
-            ASSERT_EQ(mask->GetBit(i), flags[i] == 1) << i;
-            valid += flags[i];
-        }
-        EXPECT_GT(valid, 0u);
-        EXPECT_LT(valid, 10807u);
-        EXPECT_EQ(mask->GetBits()[mask->GetByteCount() - 1] & 1, 0);  // 10807 % 8 = 7 bits
+// Each constructor's decision, and its mask of six pixels of three 8-bit channels.
+TEST(MaskDecisionBuilder, EachConstructorSetsUpItsDecision) {
+    Raster raster(RasterInfo(6, 1, 3, DataType::Type8U), RasterContext());
+    const Flags samples{5, 1, 1, 0, 0, 0, 9, 9, 5, 1, 2, 9, 2, 1, 7, 9, 1, 1};
+    std::copy(samples.begin(), samples.end(), raster.data);
+    struct Case {
+        MaskDecisionBuilder builder;
+        Fields decision;
+        Flags valid;
+    };
+    const Case cases[] = {
+        {MaskDecisionBuilder(RasterInfo(6, 1, 3, DataType::Type8U), 5.0),
+         {{5, 5, 5}, {1, 2, 3}, BkgdAnyChan, true, true},
+         {0, 1, 0, 1, 1, 1}},
+        {MaskDecisionBuilder(0.0, BkgdAllChans),
+         {{0}, {}, BkgdAllChans, false, false},
+         {1, 0, 1, 1, 1, 1}},
+        {MaskDecisionBuilder(9.0, BkgdAnyChan, {2, 3}),
+         {{9, 9}, {2, 3}, BkgdAnyChan, true, false},
+         {1, 1, 0, 0, 1, 1}},
+        {MaskDecisionBuilder(9.0, BkgdAllChans, {}),
+         {{}, {}, BkgdAllChans, true, true},
+         Flags(6, 1)},
+        {MaskDecisionBuilder(std::vector<double>{1, 2}, BkgdChanPairs),
+         {{1, 2}, {1, 2}, BkgdChanPairs, true, false},
+         {1, 1, 1, 0, 1, 1}},
+        // Channel 2 is compared with 1, channel 1 with 2, channel 3 not at all.
+        {MaskDecisionBuilder(std::vector<double>{1, 2}, BkgdAllChans, {2, 1}),
+         {{1, 2}, {2, 1}, BkgdAllChans, true, false},
+         {1, 1, 1, 1, 0, 1}},
+    };
+    for (const Case& c : cases) {
+        EXPECT_EQ(FieldsOf(DecisionOf(c.builder)), c.decision);
+        EXPECT_EQ(BitsOf(*std::unique_ptr<Mask>(c.builder.BuildMask(raster))), c.valid);
     }
 }
 
 TEST(MaskDecisionBuilder, ComplexRastersTestRealAndImaginaryPartsAsPairs) {
-    const MaskDecisionBuilder builder(3.0, BkgdAnyChan);
     Raster raster(RasterInfo(3, 1, 1, DataType::TypeC32R), RasterContext());
     const float samples[6] = {3.0f, 0.0f, 3.0f, 1.0f, 0.0f, 0.0f};
     std::copy(samples, samples + 6, reinterpret_cast<float*>(raster.data));
-    const std::unique_ptr<Mask> mask(builder.BuildMask(raster));
-    EXPECT_EQ(BitsOf(*mask), (std::vector<bool>{false, true, true}));
+    const std::unique_ptr<Mask> mask(MaskDecisionBuilder(3.0, BkgdAnyChan).BuildMask(raster));
+    EXPECT_EQ(BitsOf(*mask), (Flags{0, 1, 1}));
+}
+
+// Large rasters are flagged and packed piece by piece: every pixel's flag, margins included,
+// must land in its bit, and the bits past the last pixel stay 0. A decision flags the same
+// extent in one pass, and nothing past it.
+TEST(MaskDecisionBuilder, PiecesOfALargeRasterGiveEveryPixelsFlag) {
+    // 107 x 101 = 10807 pixels of two channels.
+    Raster raster(RasterInfo(101, 97, 2, DataType::Type16U), RasterContext(3, 2, 5, 6));
+    auto* samples = reinterpret_cast<unsigned short*>(raster.data);
+    std::uint32_t state = 1;
+    for (std::size_t i = 0; i < 2 * 10807; ++i) {
+        state = state * 1103515245u + 12345u;
+        samples[i] = static_cast<unsigned short>((state >> 16) % 3);
+    }
+    for (const BkgdRule rule : {BkgdAllChans, BkgdAnyChan, BkgdChanPairs}) {
+        const std::unique_ptr<Mask> mask(
+            MaskDecisionBuilder(std::vector<double>{0, 1}, rule).BuildMask(raster));
+        Flags flags(10808, 0xab);
+        MaskDecision(rule, {0, 1}, {1, 2}, true).Evaluate(raster, flags.data());
+        EXPECT_EQ(flags.back(), 0xab);
+        ASSERT_EQ(mask->GetBitCount(), 10807u);
+        for (unsigned int i = 0; i < 10807; ++i) {
+            const bool first = samples[2 * i] == 0;
+            const bool second = samples[2 * i + 1] == 1;
+            const bool background = rule == BkgdAnyChan ? first || second : first && second;
+            ASSERT_EQ(mask->GetBit(i), !background) << "rule " << rule << ", pixel " << i;
+            ASSERT_EQ(flags[i], background ? 0 : 1) << "rule " << rule << ", pixel " << i;
+        }
+        EXPECT_EQ(mask->GetBits()[mask->GetByteCount() - 1] & 1, 0);  // 10807 % 8 = 7 bits
+    }
+}
+
+// A client's decision: every third pixel of the extent valid. Its copies share `instances`,
+// whose use count counts them.
+struct EveryThirdPixel : IMaskDecision {
+    explicit EveryThirdPixel(std::shared_ptr<int> counter) : instances(std::move(counter)) {}
+    void Evaluate(const void*, unsigned char*, std::size_t) override {}
+    void Evaluate(const Raster& raster, unsigned char* flags) override {
+        for (std::size_t i = 0; i < std::size_t{raster.lineStride} * raster.bufferHeight; ++i) {
+            flags[i] = i % 3 == 0 ? 1 : 0;
+        }
+    }
+    unsigned char IsValid(const void*) override { return 1; }
+    IMaskDecision* Clone() const override { return new EveryThirdPixel(*this); }
+    std::shared_ptr<int> instances;
+};
+
+// A given decision is cloned and asked for the whole extent; copies of a builder share one
+// decision, released once by its last holder. Without a decision every pixel is background.
+TEST(MaskDecisionBuilder, CopiesShareOneDecisionReleasedByItsLastHolder) {
+    const auto instances = std::make_shared<int>();
+    const EveryThirdPixel prototype(instances);
+    const Raster raster(RasterInfo(2, 1, 1, DataType::Type8U), RasterContext(1, 1, 0, 0));
+    {
+        const MaskDecisionBuilder original(&prototype);
+        EXPECT_NE(original.GetDecision(), &prototype);
+        EXPECT_EQ(BitsOf(*std::unique_ptr<Mask>(original.BuildMask(raster))),
+                  (Flags{1, 0, 0, 1, 0, 0, 1, 0, 0, 1, 0, 0}));
+        MaskDecisionBuilder copy(original);
+        MaskDecisionBuilder other(&prototype);
+        EXPECT_EQ(instances.use_count(), 4);
+        other = original;
+        EXPECT_EQ(instances.use_count(), 3);
+        EXPECT_EQ(copy.GetDecision(), original.GetDecision());
+        EXPECT_EQ(other.GetDecision(), original.GetDecision());
+        copy = MaskDecisionBuilder(0.0, BkgdAnyChan);
+        EXPECT_EQ(instances.use_count(), 3);
+    }
+    EXPECT_EQ(instances.use_count(), 2);
+    const MaskDecisionBuilder none(nullptr);
+    EXPECT_EQ(BitsOf(*std::unique_ptr<Mask>(none.BuildMask(raster))), Flags(12, 0));
 }
 
 }  // namespace
