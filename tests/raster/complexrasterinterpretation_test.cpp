@@ -58,13 +58,15 @@ template <class C>
 class InnerProcessorReading : public ::testing::Test {};
 TYPED_TEST_SUITE(InnerProcessorReading, ComponentCases);
 
-// The integer extremes show sign or zero extension (a signed minimum read unsigned turns
-// positive, an unsigned maximum read signed turns to -1); both overloads read real first.
+// Integers all ones (-1 or 2^n - 1) and top bit alone (-2^(n-1) or 2^(n-1)) show the
+// extension and the width read; both overloads read the real part first.
 TYPED_TEST(InnerProcessorReading, ReadsEachComponentWithItsOwnExtension) {
     using T = typename TypeParam::Type;
     using Limits = std::numeric_limits<T>;
-    const std::vector<T> pair = {Limits::is_integer ? Limits::max() : T(1.5),
-                                 Limits::is_integer ? Limits::lowest() : T(-0.25)};
+    std::vector<T> pair = {T(1.5), T(-0.25)};
+    if constexpr (Limits::is_integer) {
+        pair = {T(~T{0}), Limits::is_signed ? Limits::lowest() : T(Limits::max() / 2 + 1)};
+    }
     const Raster in = MakeRaster(TypeParam::Descriptor(), pair);
     const ComplexInterpretation interpretation;
     const std::unique_ptr<Raster> real(interpretation.InterpretRaster(&in, INTERPRETATION_REAL));
