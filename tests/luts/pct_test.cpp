@@ -3,7 +3,6 @@
 #include <gtest/gtest.h>
 
 #include <limits>
-#include <tuple>
 #include <vector>
 
 #include "support/expectfailure.h"
@@ -13,43 +12,39 @@ namespace {
 using kora::kubo::PCT;
 using Colour = PCT::Colour;
 using Entries = std::vector<PCT::Entry>;
+using Rgb = std::vector<int>;
 
 constexpr char kSource[] = "vrkframework/basic/kubo/luts/pct";
+constexpr double kInf = std::numeric_limits<double>::infinity();
 
-auto Components(const Colour& colour) { return std::make_tuple(colour.r, colour.g, colour.b); }
-auto Components(int r, int g, int b) {
-    return Components(Colour{static_cast<unsigned char>(r), static_cast<unsigned char>(g),
-                             static_cast<unsigned char>(b)});
-}
+Rgb Components(const Colour& colour) { return {colour.r, colour.g, colour.b}; }
 
 TEST(PCT, InterpolatesEachComponentTruncatedAndClampsOutside) {
     const PCT pct(Entries{{0, {0, 0, 0}}, {10, {255, 100, 7}}});
-    EXPECT_EQ(Components(pct.GetValue(5)), Components(127, 50, 3));
-    EXPECT_EQ(Components(pct.GetValue(9.99)), Components(254, 99, 6));
-    EXPECT_EQ(Components(pct.GetValue(-1)), Components(0, 0, 0));
-    EXPECT_EQ(Components(pct.GetValue(11)), Components(255, 100, 7));
-    EXPECT_EQ(Components(pct.GetValue(std::numeric_limits<double>::quiet_NaN())),
-              Components(0, 0, 0));
+    EXPECT_EQ(Components(pct.GetValue(5)), (Rgb{127, 50, 3}));
+    EXPECT_EQ(Components(pct.GetValue(9.99)), (Rgb{254, 99, 6}));
+    EXPECT_EQ(Components(pct.GetValue(-1)), (Rgb{0, 0, 0}));
+    EXPECT_EQ(Components(pct.GetValue(11)), (Rgb{255, 100, 7}));
+    EXPECT_EQ(Components(pct.GetValue(std::numeric_limits<double>::quiet_NaN())), (Rgb{0, 0, 0}));
     // A falling component: signed difference, then truncation toward zero (4.5 gives 4).
     const PCT falling(Entries{{0, {200, 0, 9}}, {10, {100, 0, 0}}});
-    EXPECT_EQ(Components(falling.GetValue(5)), Components(150, 0, 4));
-    EXPECT_EQ(Components(falling.GetValue(9.99)), Components(100, 0, 0));
+    EXPECT_EQ(Components(falling.GetValue(5)), (Rgb{150, 0, 4}));
+    EXPECT_EQ(Components(falling.GetValue(9.99)), (Rgb{100, 0, 0}));
+    // Between -inf and 0 the position is inf / inf = NaN: the upper colour answers.
+    const PCT infinite(Entries{{-kInf, {10, 20, 30}}, {0, {40, 50, 60}}});
+    EXPECT_EQ(Components(infinite.GetValue(-5)), (Rgb{40, 50, 60}));
+    EXPECT_EQ(Components(infinite.GetValue(-kInf)), (Rgb{10, 20, 30}));
 }
 
-TEST(PCT, SharesTheLookupRulesForEqualInputsOrderAndInfinities) {
+TEST(PCT, SharesTheLookupRulesForEqualInputsAndOrder) {
     const PCT direct(Entries{{1, {1, 1, 1}}, {1, {2, 2, 2}}, {2, {4, 4, 4}}});
-    EXPECT_EQ(Components(direct.GetValue(1)), Components(2, 2, 2));
+    EXPECT_EQ(Components(direct.GetValue(1)), (Rgb{2, 2, 2}));
     const PCT searched(
         Entries{{-1, {0, 0, 0}}, {0.5, {1, 1, 1}}, {0.5, {3, 3, 3}}, {2, {9, 9, 9}}});
-    EXPECT_EQ(Components(searched.GetValue(0.5)), Components(1, 1, 1));
+    EXPECT_EQ(Components(searched.GetValue(0.5)), (Rgb{1, 1, 1}));
     const Entries sorted = PCT(Entries{{5, {1, 2, 3}}, {0, {4, 5, 6}}}).GetEntries();
     EXPECT_EQ(sorted[0].first, 0);
-    EXPECT_EQ(Components(sorted[0].second), Components(4, 5, 6));
-    // Between -inf and 0 the position is inf / inf = NaN: the upper colour answers.
-    const double inf = std::numeric_limits<double>::infinity();
-    const PCT infinite(Entries{{-inf, {10, 20, 30}}, {0, {40, 50, 60}}});
-    EXPECT_EQ(Components(infinite.GetValue(-5)), Components(40, 50, 60));
-    EXPECT_EQ(Components(infinite.GetValue(-inf)), Components(10, 20, 30));
+    EXPECT_EQ(Components(sorted[0].second), (Rgb{4, 5, 6}));
 }
 
 TEST(PCT, ClassicTablesFromColoursOrPlanes) {
@@ -64,17 +59,15 @@ TEST(PCT, ClassicTablesFromColoursOrPlanes) {
     const PCT fromPlanes(planes.data());
     const PCT fromColours(colours);
     EXPECT_EQ(Components(fromPlanes.GetValueByIndex(3)),
-              Components(planes[3], planes[259], planes[515]));
+              (Rgb{planes[3], planes[259], planes[515]}));
     for (unsigned int i = 0; i < 256; ++i) {
         EXPECT_EQ(fromColours.GetEntries()[i].first, i);
         EXPECT_EQ(Components(fromColours.GetValue(i)), Components(fromPlanes.GetValue(i))) << i;
     }
     EXPECT_EQ(Components(fromPlanes.GetValueByIndex(999)), Components(colours[255]));
-    double min = 1;
-    double max = 0;
-    fromPlanes.GetInputValueRange(min, max);
-    EXPECT_EQ(min, 0);
-    EXPECT_EQ(max, 255);
+    double range[2] = {1, 0};
+    fromPlanes.GetInputValueRange(range[0], range[1]);
+    EXPECT_EQ(std::vector<double>(range, range + 2), (std::vector<double>{0, 255}));
     EXPECT_EQ(fromPlanes.GetEntryCount(), 256u);
 }
 
@@ -90,28 +83,25 @@ TEST(PCT, ClassicNeeds256InputsFrom0To255WhateverTheColours) {
     EXPECT_FALSE(IsClassicPCT(PCT(entries)));
 }
 
-TEST(PCT, ThrowsWhenColourVectorHasNot256Entries) {
-    const auto failure =
+TEST(PCT, ThrowsOnAColourVectorOfAnotherSizeOrFewerThanTwoEntries) {
+    const auto colours =
         kubo_test::Catch<kora::DataException>([] { PCT(std::vector<Colour>(10)); });
-    ASSERT_TRUE(failure);
-    kubo_test::ExpectReport(*failure, "PCT must have 256 entries, 10 given.", kSource,
+    ASSERT_TRUE(colours);
+    kubo_test::ExpectReport(*colours, "PCT must have 256 entries, 10 given.", kSource,
                             "__cdecl kora::kubo::PCT::PCT(const class std::vector<struct "
                             "kora::kubo::RGBTuple<unsigned char>,class std::allocator<struct "
                             "kora::kubo::RGBTuple<unsigned char> > > &)",
                             54);
-}
-
-TEST(PCT, ThrowsWhenGivenFewerThanTwoEntries) {
-    const auto failure = kubo_test::Catch<kora::ParameterException>([] {
+    const auto entries = kubo_test::Catch<kora::ParameterException>([] {
         PCT(Entries{{0, {1, 2, 3}}});
     });
-    ASSERT_TRUE(failure);
-    EXPECT_EQ(failure->GetParameterName(), "PCT");
-    EXPECT_EQ(static_cast<int>(failure->GetType()), 8);
-    EXPECT_EQ(failure->GetReceived(), "A 1 PCT entries");
-    EXPECT_EQ(failure->GetExpected(), "At least 2 PCT entries");
+    ASSERT_TRUE(entries);
+    EXPECT_EQ(entries->GetParameterName(), "PCT");
+    EXPECT_EQ(static_cast<int>(entries->GetType()), 8);
+    EXPECT_EQ(entries->GetReceived(), "A 1 PCT entries");
+    EXPECT_EQ(entries->GetExpected(), "At least 2 PCT entries");
     kubo_test::ExpectReport(
-        *failure, "desc", kSource,
+        *entries, "desc", kSource,
         "__cdecl kora::kubo::PCT::PCT(const class std::vector<struct std::pair<double,struct "
         "kora::kubo::RGBTuple<unsigned char> >,class std::allocator<struct "
         "std::pair<double,struct kora::kubo::RGBTuple<unsigned char> > > > &)",
