@@ -6,7 +6,7 @@
 #include <climits>    // ULONG_MAX
 #include <cstdint>    // std::uint64_t
 #include <cstring>    // std::memcpy
-#include <utility>    // std::move, std::pair
+#include <utility>    // std::move
 #include <vector>
 
 #include "vrkframework/basic/kubo/raster/alternatingruns.h"
@@ -21,47 +21,82 @@ namespace {
 constexpr char kSourcePath[] = "vrkframework/basic/kubo/raster/linerlecompressedbitmask";
 constexpr char kNullOutput[] = "pBuffer is NULL, cannot Decode in NULL buffer";
 
+[[noreturn]] void ThrowStartNotFound() {
+    throw kora::DataException(
+        "Uncompressed index not found.", kSourcePath,
+        "void __cdecl kora::kubo::LineRLECompressedBitMask::DecodePartialRow(unsigned "
+        "long,unsigned long,unsigned long,unsigned char *) const",
+        327);
+}
+
+/// Where a pixel lies in a row: `next` is the run after the one that holds it and `end`
+/// the pixel where that run ends.
+struct RunEnd {
+    std::size_t next;
+    std::uint64_t end;
+};
+
+// The run that holds pixel `start` (> 0): the first whose end reaches it.
+inline RunEnd FindPixel(const unsigned char* runs, std::size_t runCount, std::uint64_t start) {
+    std::size_t run = 0;
+    std::uint64_t sum = 0;
+    // Eight runs at once while they all end before the start; once they do not, the
+    // start lies within them and needs no bound check.
+    for (; runCount - run >= 8; run += 8) {
+        const std::uint64_t eight = detail::SumOfEightBytes(runs + run);
+        if (sum + eight >= start) {
+            do {
+                sum += runs[run++];
+            } while (sum < start);
+            return {run, sum};
+        }
+        sum += eight;
+    }
+    while (sum < start && run < runCount) {
+        sum += runs[run++];
+    }
+    if (sum < start) {
+        ThrowStartNotFound();
+    }
+    return {run, sum};
+}
+
 // Writes pixels start to start + count - 1 of a row, one byte (0 or 1) each. Calls stay
 // inside this file, so that they are direct.
-void DecodeRuns(const unsigned char* runs, std::size_t runCount, unsigned long start,
-                unsigned long count, unsigned char* out) {
+inline void DecodeRuns(const unsigned char* runs, std::size_t runCount, unsigned long start,
+                       unsigned long count, unsigned char* out) {
     std::size_t run = 0;
-    unsigned long written = 0;
+    std::uint64_t length = 0;  // pixels of the current value from `out` on
+    bool value = false;
     if (start != 0) {
-        std::uint64_t sum = 0;
-        // Eight runs at once while they all end before the start.
-        while (runCount - run >= 8 && sum + detail::SumOfEightBytes(runs + run) < start) {
-            sum += detail::SumOfEightBytes(runs + run);
-            run += 8;
-        }
-        // The start lies within the next eight runs, or past the row.
-        while (sum < start && runCount - run >= 4) {
-            std::uint64_t added = 0;
-            run += detail::AddBytesUntil(runs + run, start - sum, added);
-            sum += added;
-        }
-        while (sum < start && run < runCount) {
-            sum += runs[run++];
-        }
-        if (sum < start) {
-            throw kora::DataException(
-                "Uncompressed index not found.", kSourcePath,
-                "void __cdecl kora::kubo::LineRLECompressedBitMask::DecodePartialRow(unsigned "
-                "long,unsigned long,unsigned long,unsigned char *) const",
-                327);
-        }
-        // Pixel `start` lies in the last run added; the rest of that run comes first.
-        written = static_cast<unsigned long>(std::min<std::uint64_t>(sum - start, count));
-        detail::FillBytes(out, detail::RunValue(run - 1), written);
+        const RunEnd found = FindPixel(runs, runCount, start);
+        run = found.next;
+        length = found.end - start;  // the rest of the run that holds the start
+        value = detail::RunValue(run - 1);
+    } else if (runCount != 0) {
+        length = runs[run++];
     }
-    while (written < count && run < runCount) {
-        const bool value = detail::RunValue(run);
-        const auto length = static_cast<unsigned long>(std::min<std::uint64_t>(
-            detail::NextStretch(runs, runCount, run, count - written), count - written));
-        detail::FillBytes(out + written, value, length);
-        written += length;
+    std::uint64_t left = count;
+    for (;;) {
+        // A 0 run after a run of 255 continues the value.
+        while (length < left && run + 1 < runCount && runs[run] == 0) {
+            length += runs[run + 1];
+            run += 2;
+        }
+        if (length >= left) {
+            detail::FillBytes(out, value, static_cast<std::size_t>(left));
+            return;
+        }
+        detail::FillBytes(out, value, static_cast<std::size_t>(length));
+        out += length;
+        left -= length;
+        if (run >= runCount) {
+            detail::FillBytes(out, 0, static_cast<std::size_t>(left));  // past the runs: clear
+            return;
+        }
+        value = detail::RunValue(run);
+        length = runs[run++];
     }
-    detail::FillBytes(out + written, 0, count - written);  // past the runs: clear
 }
 
 // Appends the runs of `count` mask bytes (zero clear, anything else set).
@@ -80,19 +115,17 @@ void AppendRowRuns(const unsigned char* data, std::size_t count, detail::ByteSin
 
 /// Where each row's runs are (null while the row is empty) and how many there are.
 struct LineRLECompressedBitMask::RowTable {
-    explicit RowTable(unsigned int height)
-        : starts(height, nullptr), sizes(height, 0u), owned(height) {}
+    struct Row {
+        const unsigned char* runs = nullptr;
+        std::size_t size = 0;
+    };
 
-    /// The runs of `row` and their number: none for a row not stored yet or past the last.
-    std::pair<const unsigned char*, std::size_t> Runs(unsigned long row) const {
-        if (row >= starts.size()) {
-            return {nullptr, 0};
-        }
-        return {starts[row], sizes[row]};
-    }
+    explicit RowTable(unsigned int height) : rows(height), owned(height) {}
 
-    std::vector<const unsigned char*> starts;
-    std::vector<unsigned int> sizes;
+    /// The runs of `row`: none for a row not stored yet or past the last.
+    Row Runs(unsigned long row) const { return row < rows.size() ? rows[row] : Row(); }
+
+    std::vector<Row> rows;
     /// The rows compressed from a raster, back to back, so that rows decoded one after
     /// the other share cache lines; a row replaced later just stops pointing here.
     detail::EncodedBytes block;
@@ -122,8 +155,7 @@ LineRLECompressedBitMask::LineRLECompressedBitMask(Raster& raster)
     table.block = sink.Release();
     std::size_t begin = 0;
     for (unsigned int row = 0; row < raster.height; ++row) {
-        table.starts[row] = table.block.get() + begin;
-        table.sizes[row] = static_cast<unsigned int>(ends[row] - begin);
+        table.rows[row] = {table.block.get() + begin, ends[row] - begin};
         begin = ends[row];
     }
 }
@@ -152,11 +184,11 @@ unsigned long LineRLECompressedBitMask::GetBufferSize() const {
 }
 
 const unsigned char* LineRLECompressedBitMask::GetCompressedRow(unsigned long row) const {
-    return m_rows->Runs(row).first;
+    return m_rows->Runs(row).runs;
 }
 
 unsigned int LineRLECompressedBitMask::GetCompressedRowSize(unsigned long row) const {
-    return static_cast<unsigned int>(m_rows->Runs(row).second);
+    return static_cast<unsigned int>(m_rows->Runs(row).size);
 }
 
 std::unique_ptr<unsigned char[]> LineRLECompressedBitMask::Compress(unsigned char* data,
@@ -176,8 +208,7 @@ void LineRLECompressedBitMask::CompressRow(unsigned char* data, unsigned long ro
     }
     unsigned long size = 0;
     std::unique_ptr<unsigned char[]> runs = Compress(data, GetRowSize(), size);
-    m_rows->starts[row] = runs.get();
-    m_rows->sizes[row] = static_cast<unsigned int>(size);
+    m_rows->rows[row] = {runs.get(), size};
     m_rows->owned[row] = std::move(runs);  // releases the buffer the row had, if any
 }
 
@@ -191,8 +222,8 @@ void LineRLECompressedBitMask::DecodeRow(unsigned long row, unsigned char* out) 
 
 void LineRLECompressedBitMask::DecodePartialRow(unsigned long row, unsigned long start,
                                                 unsigned long count, unsigned char* out) const {
-    const auto runs = m_rows->Runs(row);
-    DecodeRuns(runs.first, runs.second, start, count, out);
+    const RowTable::Row runs = m_rows->Runs(row);
+    DecodeRuns(runs.runs, runs.size, start, count, out);
 }
 
 unsigned char* LineRLECompressedBitMask::Decode() const {
@@ -214,8 +245,8 @@ void LineRLECompressedBitMask::Decode(unsigned char* out) const {
     }
     const unsigned long rowSize = GetRowSize();
     for (unsigned int row = 0; row < m_info.height; ++row) {
-        const auto runs = m_rows->Runs(row);
-        DecodeRuns(runs.first, runs.second, 0, m_info.width, out + row * rowSize);
+        const RowTable::Row runs = m_rows->Runs(row);
+        DecodeRuns(runs.runs, runs.size, 0, m_info.width, out + row * rowSize);
     }
 }
 
@@ -238,11 +269,12 @@ void LineRLECompressedBitMask::DecodeWindow(int x, int y, int w, int h, unsigned
     // A negative x wraps to a start past every row, a negative row to an index past the
     // last one; the sum is 64-bit so that it cannot wrap.
     const unsigned long spacing = count * GetBytesPerPixel();
+    const RowTable& table = *m_rows;
     unsigned long o = 0;
     for (long long row = y; row < static_cast<long long>(y) + h && o < capacity;
          ++row, o += spacing) {
-        const auto runs = m_rows->Runs(static_cast<unsigned long>(row));
-        DecodeRuns(runs.first, runs.second, static_cast<unsigned long>(x),
+        const RowTable::Row runs = table.Runs(static_cast<unsigned long>(row));
+        DecodeRuns(runs.runs, runs.size, static_cast<unsigned long>(x),
                    std::min(count, capacity - o), out + o);
     }
 }

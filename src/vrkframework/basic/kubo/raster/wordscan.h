@@ -81,26 +81,6 @@ inline std::uint64_t SumOfEightBytes(const unsigned char* bytes) {
     return (pairs * 0x0001000100010001ull) >> 48;
 }
 
-/// Adds the 4 bytes at `bytes` one after the other until the sum reaches `target`:
-/// returns how many were added (all 4 when they fall short) and sets `sum` to their sum.
-/// The running sums sit in 16-bit lanes and are compared all at once, so no branch
-/// depends on where the target falls.
-inline unsigned int AddBytesUntil(const unsigned char* bytes, std::uint64_t target,
-                                  std::uint64_t& sum) {
-    constexpr std::uint64_t kLanes = 0x0001000100010001ull;
-    constexpr std::uint64_t kLaneTops = kLanes << 15;
-    const std::uint64_t spread = std::uint64_t{bytes[0]} | (std::uint64_t{bytes[1]} << 16) |
-                                 (std::uint64_t{bytes[2]} << 32) | (std::uint64_t{bytes[3]} << 48);
-    const std::uint64_t running = spread * kLanes;  // lane k: bytes 0 to k, at most 1020
-    // A lane keeps its top bit when its sum is at least the target; no lane borrows, as
-    // the target is cut to below the top bit (sums never exceed 1020 anyway).
-    const std::uint64_t clipped = target < 0x7FFF ? target : 0x7FFF;
-    const std::uint64_t reached = ((running | kLaneTops) - clipped * kLanes) & kLaneTops;
-    const unsigned int lane = reached != 0 ? LowestSetBit(reached) / 16 : 3;
-    sum = (running >> (16 * lane)) & 0xFFFF;
-    return lane + 1;
-}
-
 /// The 8 bytes at `bytes` with bytes[0] in the highest byte, so that the bit stream read
 /// most significant bit first runs from bit 63 down.
 inline std::uint64_t LoadHighFirst(const unsigned char* bytes) {
