@@ -160,7 +160,7 @@ TYPED_TEST(BitDepth, PacksAndUnpacksEveryBitCountInEveryVariant) {
             {"class", [&](const unsigned char* s, void* d, std::size_t n) {
                  unpacker->Promote(s, d, static_cast<unsigned int>(n));
              }}};
-        for (KernelVariant variant : {KernelVariant::kBaseline, KernelVariant::kAvx2}) {
+        for (KernelVariant variant : typeconv::detail::kKernelVariants) {
             if (const KernelSet* kernels = typeconv::detail::FindKernels(variant)) {
                 const std::string name = "variant " + std::to_string(static_cast<int>(variant));
                 packs.push_back({name, [=](const void* s, unsigned char* d, std::size_t n) {

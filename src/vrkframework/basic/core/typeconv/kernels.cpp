@@ -17,24 +17,25 @@ constexpr std::size_t Log2(std::size_t size) {
 /// shares the contiguous kernels.
 constexpr std::size_t kBlockBytes = 8192;
 
-bool ProcessorHasAvx2() {
-#if defined(KUBO_HAVE_AVX2_KERNELS)
-    return __builtin_cpu_supports("avx2") != 0;
-#else
-    return false;
-#endif
-}
-
 }  // namespace
 
 const KernelSet* FindKernels(KernelVariant variant) {
     switch (variant) {
         case KernelVariant::kBaseline:
             return &BaselineKernelSet();
+#if defined(KUBO_HAVE_X86_KERNELS)
         case KernelVariant::kAvx2:
-#if defined(KUBO_HAVE_AVX2_KERNELS)
-            return ProcessorHasAvx2() ? &Avx2KernelSet() : nullptr;
+            return __builtin_cpu_supports("avx2") ? &Avx2KernelSet() : nullptr;
+        case KernelVariant::kAvx512:
+            // The subsets the compiler uses for the AVX-512 kernels.
+            return __builtin_cpu_supports("avx2") && __builtin_cpu_supports("avx512f") &&
+                           __builtin_cpu_supports("avx512bw") &&
+                           __builtin_cpu_supports("avx512dq") && __builtin_cpu_supports("avx512vl")
+                       ? &Avx512KernelSet()
+                       : nullptr;
 #else
+        case KernelVariant::kAvx2:
+        case KernelVariant::kAvx512:
             return nullptr;
 #endif
     }
@@ -42,8 +43,15 @@ const KernelSet* FindKernels(KernelVariant variant) {
 }
 
 const KernelSet& ActiveKernels() {
-    static const KernelSet& active =
-        ProcessorHasAvx2() ? *FindKernels(KernelVariant::kAvx2) : BaselineKernelSet();
+    static const KernelSet& active = []() -> const KernelSet& {
+        for (auto variant = kKernelVariants.rbegin(); variant != kKernelVariants.rend();
+             ++variant) {
+            if (const KernelSet* kernels = FindKernels(*variant)) {
+                return *kernels;
+            }
+        }
+        return BaselineKernelSet();
+    }();
     return active;
 }
 

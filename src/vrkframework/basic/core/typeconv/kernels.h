@@ -56,7 +56,11 @@ struct KernelSet {
 };
 
 /// The instruction sets kernels are compiled for.
-enum class KernelVariant { kBaseline, kAvx2 };
+enum class KernelVariant { kBaseline, kAvx2, kAvx512 };
+
+/// Every variant, fastest last.
+constexpr std::array<KernelVariant, 3> kKernelVariants = {
+    KernelVariant::kBaseline, KernelVariant::kAvx2, KernelVariant::kAvx512};
 
 /// The kernels of `variant`, or null when this build or this processor lacks them.
 KUBO_API const KernelSet* FindKernels(KernelVariant variant);
@@ -84,8 +88,9 @@ constexpr std::array<const char*, kComponentCount> kComponentTypeNames = {
 
 // Defined by the kernel files, one per instruction set.
 const KernelSet& BaselineKernelSet();
-#if defined(KUBO_HAVE_AVX2_KERNELS)
+#if defined(KUBO_HAVE_X86_KERNELS)
 const KernelSet& Avx2KernelSet();
+const KernelSet& Avx512KernelSet();
 #endif
 
 }  // namespace typeconv::detail

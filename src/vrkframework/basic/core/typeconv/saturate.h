@@ -24,6 +24,15 @@ constexpr bool kIsUnsigned64 = std::is_integral_v<T>&& std::is_unsigned_v<T> && 
 template <class T>
 constexpr bool kIsNarrowSigned = std::is_integral_v<T>&& std::is_signed_v<T> && sizeof(T) < 8;
 
+/// AVX-512 (F and DQ) converts directly between floating values and unsigned 32-bit or any
+/// 64-bit integers, so there the plain conversions vectorise and are used; elsewhere the
+/// helpers below build the same results from signed 32-bit conversions.
+#if defined(__AVX512F__) && defined(__AVX512DQ__)
+constexpr bool kDirectConversions = true;
+#else
+constexpr bool kDirectConversions = false;
+#endif
+
 template <class To, class From>
 inline To BitCast(From value) {
     static_assert(sizeof(To) == sizeof(From), "bit casts keep the size");
@@ -129,7 +138,7 @@ inline float Int64ToFloat(A x) {
 
 template <class B, class A>
 inline B IntegerToFloating(A x) {
-    if constexpr (sizeof(A) < 4 || (sizeof(A) == 4 && std::is_signed_v<A>)) {
+    if constexpr (sizeof(A) < 4 || (sizeof(A) == 4 && std::is_signed_v<A>) || kDirectConversions) {
         return static_cast<B>(x);
     } else if constexpr (sizeof(A) == 4) {
         return UInt32ToFloating<B>(x);
@@ -155,7 +164,9 @@ constexpr A LargestConvertibleBelow(A limit) {
 /// Truncates c in [0, 2^32).
 template <class A>
 inline std::uint32_t TruncateToUInt32(A c) {
-#if defined(__AVX2__)
+#if defined(__AVX512F__)
+    return static_cast<std::uint32_t>(c);
+#elif defined(__AVX2__)
     // trunc(c) + 2^52 holds the integer in the low bits of its mantissa.
     return static_cast<std::uint32_t>(
         BitCast<std::uint64_t>(std::trunc(static_cast<double>(c)) + 0x1p52));
@@ -173,7 +184,9 @@ inline std::uint32_t TruncateToUInt32(A c) {
 /// Truncates c in [0, 2^64).
 template <class A>
 inline std::uint64_t TruncateToUInt64(A c) {
-#if defined(__AVX2__)
+#if defined(__AVX512DQ__)
+    return static_cast<std::uint64_t>(c);
+#elif defined(__AVX2__)
     // AVX2 has no 64-bit conversion: the two halves of trunc(c) are exact doubles below
     // 2^32, and each reads as an integer from the mantissa of its sum with 2^52.
     const double whole = std::trunc(static_cast<double>(c));

@@ -1,0 +1,15 @@
+// The kernels compiled for AVX-512 F, BW, DQ and VL (this file alone is built with them);
+// used only when the processor reports all four. They bring direct conversions between
+// floating values and unsigned or 64-bit integers.
+#include "vrkframework/basic/core/typeconv/kernelset_impl.h"
+
+#if !defined(__AVX512F__) || !defined(__AVX512BW__) || !defined(__AVX512DQ__) || \
+    !defined(__AVX512VL__)
+#error "kernels_avx512.cpp must be compiled with AVX-512 F, BW, DQ and VL enabled"
+#endif
+
+namespace typeconv::detail {
+
+const KernelSet& Avx512KernelSet() { return kKernelSet; }
+
+}  // namespace typeconv::detail
