@@ -12,9 +12,9 @@ constexpr std::size_t Log2(std::size_t size) {
     return size == 1 ? 0 : size == 2 ? 1 : size == 4 ? 2 : 3;
 }
 
-/// The complex layouts with one component side convert through a small block that stays
-/// in the first-level cache: contiguous conversion, then (de)interleaving, so every pair
-/// shares the contiguous kernels.
+/// Real to complex conversions go through a small block that stays in the first-level
+/// cache: contiguous conversion, then interleaving with zeros, so every pair shares the
+/// contiguous kernels.
 constexpr std::size_t kBlockBytes = 8192;
 
 }  // namespace
@@ -65,26 +65,22 @@ void RunPromote(const KernelSet& kernels, SampleLayout layout, std::size_t from,
         case SampleLayout::kComplex:
             convert(src, dst, 2 * count);
             return;
-        case SampleLayout::kRealToComplex:
         case SampleLayout::kComplexToReal:
+            kernels.convertRealParts[from][to](src, dst, count);
+            return;
+        case SampleLayout::kRealToComplex:
             break;
     }
-    const bool toComplex = layout == SampleLayout::kRealToComplex;
     const std::size_t fromSize = kSizeOf[from];
     const std::size_t toSize = kSizeOf[to];
-    const std::size_t blockCount = kBlockBytes / (toComplex ? toSize : fromSize);
+    const std::size_t blockCount = kBlockBytes / toSize;
     alignas(64) unsigned char block[kBlockBytes];
     const auto* in = static_cast<const unsigned char*>(src);
     auto* out = static_cast<unsigned char*>(dst);
     for (std::size_t done = 0; done < count; done += blockCount) {
         const std::size_t n = count - done < blockCount ? count - done : blockCount;
-        if (toComplex) {
-            convert(in + done * fromSize, block, n);
-            kernels.interleaveWithZeros[Log2(toSize)](block, out + 2 * done * toSize, n);
-        } else {
-            kernels.takeRealParts[Log2(fromSize)](in + 2 * done * fromSize, block, n);
-            convert(block, out + done * toSize, n);
-        }
+        convert(in + done * fromSize, block, n);
+        kernels.interleaveWithZeros[Log2(toSize)](block, out + 2 * done * toSize, n);
     }
 }
 

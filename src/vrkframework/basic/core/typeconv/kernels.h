@@ -46,10 +46,10 @@ using PackKernel = void (*)(const void* samples, unsigned char* packed, std::siz
 struct KernelSet {
     /// [source index][destination index]: contiguous values, rule per value.
     std::array<std::array<ConvertKernel, kComponentCount>, kComponentCount> convert;
+    /// [source index][destination index]: the real parts of (real, imaginary) pairs.
+    std::array<std::array<ConvertKernel, kComponentCount>, kComponentCount> convertRealParts;
     /// [log2 of the value size]: values to (value, 0) pairs.
     std::array<ConvertKernel, 4> interleaveWithZeros;
-    /// [log2 of the value size]: (real, imaginary) pairs to their real values.
-    std::array<ConvertKernel, 4> takeRealParts;
     /// [component index]: null for float and double.
     std::array<UnpackKernel, kComponentCount> unpack;
     std::array<PackKernel, kComponentCount> pack;

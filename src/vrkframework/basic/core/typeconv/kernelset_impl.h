@@ -19,17 +19,25 @@ namespace {
 
 // ---------------------------------------------------------------- element conversions
 
-template <class A, class B>
+/// Converts every Stride-th value: 1 for contiguous values, 2 for the real parts of
+/// (real, imaginary) pairs, read in place rather than gathered first.
+template <class A, class B, std::size_t Stride>
 void ConvertLoop(const A* __restrict src, B* __restrict dst, std::size_t count) {
     for (std::size_t i = 0; i < count; ++i) {
-        dst[i] = ConvertSample<B>(src[i]);
+        dst[i] = ConvertSample<B>(src[Stride * i]);
     }
 }
 
-template <class A, class B>
+template <class A, class B, std::size_t Stride>
 void Convert(const void* src, void* dst, std::size_t count) {
-    ConvertLoop(static_cast<const A*>(src), static_cast<B*>(dst), count);
+    ConvertLoop<A, B, Stride>(static_cast<const A*>(src), static_cast<B*>(dst), count);
 }
+
+template <std::size_t Size>
+using UnsignedOfSize = std::conditional_t<
+    Size == 1, std::uint8_t,
+    std::conditional_t<Size == 2, std::uint16_t,
+                       std::conditional_t<Size == 4, std::uint32_t, std::uint64_t>>>;
 
 template <std::size_t Size>
 void Copy(const void* src, void* dst, std::size_t count) {
@@ -38,23 +46,25 @@ void Copy(const void* src, void* dst, std::size_t count) {
     }
 }
 
-/// Pairs whose rule is the identity on the bits share the copy; unsigned sources into
-/// wider integers (zero extension) and signed 8/16/32-bit sources into 64-bit integers
-/// (negatives to 0) give the same bits for both signs of the destination and share the
-/// unsigned destination's kernel.
-template <class A, class B>
+/// Pairs whose rule is the identity on the bits share the copy (or, strided, the unsigned
+/// identity); unsigned sources into wider integers (zero extension) and signed 8/16/32-bit
+/// sources into 64-bit integers (negatives to 0) give the same bits for both signs of the
+/// destination and share the unsigned destination's kernel.
+template <class A, class B, std::size_t Stride>
 constexpr ConvertKernel SelectConvertKernel() {
     constexpr bool kSameBits =
         sizeof(A) == sizeof(B) && std::is_integral_v<A> && std::is_integral_v<B> &&
         (std::is_signed_v<A> == std::is_signed_v<B> || (std::is_signed_v<A> && sizeof(A) == 8));
-    if constexpr (std::is_same_v<A, B> || kSameBits) {
+    if constexpr ((std::is_same_v<A, B> || kSameBits) && Stride == 1) {
         return &Copy<sizeof(A)>;
+    } else if constexpr (std::is_same_v<A, B> || kSameBits) {
+        return &Convert<UnsignedOfSize<sizeof(A)>, UnsignedOfSize<sizeof(A)>, Stride>;
     } else if constexpr (std::is_integral_v<A> && std::is_integral_v<B> &&
                          (std::is_unsigned_v<A> ? sizeof(B) > sizeof(A)
                                                 : sizeof(B) == 8 && sizeof(A) < 8)) {
-        return &Convert<A, std::make_unsigned_t<B>>;
+        return &Convert<A, std::make_unsigned_t<B>, Stride>;
     } else {
-        return &Convert<A, B>;
+        return &Convert<A, B, Stride>;
     }
 }
 
@@ -65,15 +75,6 @@ void InterleaveWithZeros(const void* values, void* pairs, std::size_t count) {
     for (std::size_t i = 0; i < count; ++i) {
         out[2 * i] = in[i];
         out[2 * i + 1] = 0;
-    }
-}
-
-template <class T>
-void TakeRealParts(const void* pairs, void* values, std::size_t count) {
-    const T* __restrict in = static_cast<const T*>(pairs);
-    T* __restrict out = static_cast<T*>(values);
-    for (std::size_t i = 0; i < count; ++i) {
-        out[i] = in[2 * i];
     }
 }
 
@@ -149,14 +150,6 @@ inline std::uint32_t GatherBits(const unsigned char* packed, std::size_t positio
     return value;
 }
 
-/// AVX-512 DQ multiplies 64-bit lanes in one instruction, which makes spreading a byte
-/// by multiplication the fastest one-bit unpacking there; elsewhere the shifts are.
-#if defined(__AVX512DQ__)
-constexpr bool kVectorMultiply64 = true;
-#else
-constexpr bool kVectorMultiply64 = false;
-#endif
-
 /// Bits dividing 8: each byte spreads into 8 / Bits samples, most significant bits first.
 /// Returns the samples done (whole bytes), as the other special loops do.
 template <unsigned int Bits, class T>
@@ -165,9 +158,10 @@ std::size_t UnpackWithinBytes(const unsigned char* __restrict packed, T* __restr
     constexpr unsigned int kPerByte = 8 / Bits;
     for (std::size_t i = 0; i < count / kPerByte; ++i) {
         const unsigned int byte = packed[i];
-        if constexpr (Bits == 1 && sizeof(T) == 1 && kVectorMultiply64) {
-            // A copy of the byte in every byte of the word, masked to bit 7 - j in byte j;
-            // adding 0x7F carries each such bit into bit 7 of its byte.
+        if constexpr (Bits == 1 && sizeof(T) == 1 && kAvx512) {
+            // AVX-512 multiplies 64-bit lanes, which makes this the fastest there (the
+            // shifts are elsewhere): a copy of the byte in every byte of the word, masked
+            // to bit 7 - j in byte j; adding 0x7F carries each such bit into bit 7.
             const std::uint64_t spread = (byte * 0x0101010101010101u) & 0x0102040810204080u;
             const std::uint64_t ones = (spread + 0x7F7F7F7F7F7F7F7Fu) >> 7 & 0x0101010101010101u;
             StoreLittleEndian64(reinterpret_cast<unsigned char*>(samples + 8 * i), ones);
@@ -393,9 +387,9 @@ struct ComponentAt<0, List> {
 template <std::size_t Index>
 using Component = typename ComponentAt<Index>::type;
 
-template <class A, std::size_t... To>
+template <class A, std::size_t Stride, std::size_t... To>
 constexpr std::array<ConvertKernel, kComponentCount> MakeConvertRow(std::index_sequence<To...>) {
-    return {{SelectConvertKernel<A, Component<To>>()...}};
+    return {{SelectConvertKernel<A, Component<To>, Stride>()...}};
 }
 
 template <class T>
@@ -419,11 +413,10 @@ constexpr PackKernel SelectPackKernel() {
 template <std::size_t... Index>
 constexpr KernelSet MakeKernelSet(std::index_sequence<Index...> indices) {
     return KernelSet{
-        {{MakeConvertRow<Component<Index>>(indices)...}},
+        {{MakeConvertRow<Component<Index>, 1>(indices)...}},
+        {{MakeConvertRow<Component<Index>, 2>(indices)...}},
         {{&InterleaveWithZeros<std::uint8_t>, &InterleaveWithZeros<std::uint16_t>,
           &InterleaveWithZeros<std::uint32_t>, &InterleaveWithZeros<std::uint64_t>}},
-        {{&TakeRealParts<std::uint8_t>, &TakeRealParts<std::uint16_t>,
-          &TakeRealParts<std::uint32_t>, &TakeRealParts<std::uint64_t>}},
         {{SelectUnpackKernel<Component<Index>>()...}},
         {{SelectPackKernel<Component<Index>>()...}},
     };
