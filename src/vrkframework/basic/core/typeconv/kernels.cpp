@@ -55,6 +55,22 @@ const KernelSet& ActiveKernels() {
     return active;
 }
 
+KernelSet WithGapsFilled(KernelSet kernels, const KernelSet& fallback) {
+    const auto fill = [](auto& entries, const auto& fallbackEntries) {
+        for (std::size_t i = 0; i < entries.size(); ++i) {
+            entries[i] = entries[i] != nullptr ? entries[i] : fallbackEntries[i];
+        }
+    };
+    for (std::size_t from = 0; from < kComponentCount; ++from) {
+        fill(kernels.convert[from], fallback.convert[from]);
+        fill(kernels.convertRealParts[from], fallback.convertRealParts[from]);
+    }
+    fill(kernels.interleaveWithZeros, fallback.interleaveWithZeros);
+    fill(kernels.unpack, fallback.unpack);
+    fill(kernels.pack, fallback.pack);
+    return kernels;
+}
+
 void RunPromote(const KernelSet& kernels, SampleLayout layout, std::size_t from, std::size_t to,
                 const void* src, void* dst, std::size_t count) {
     const ConvertKernel convert = kernels.convert[from][to];

@@ -86,6 +86,9 @@ constexpr std::array<const char*, kComponentCount> kComponentTypeNames = {
     "char",         "unsigned char", "short",  "unsigned short", "int",
     "unsigned int", "float",         "double", "__int64",        "unsigned __int64"};
 
+/// `kernels` with every null kernel replaced by the one of `fallback`.
+KernelSet WithGapsFilled(KernelSet kernels, const KernelSet& fallback);
+
 // Defined by the kernel files, one per instruction set.
 const KernelSet& BaselineKernelSet();
 #if defined(KUBO_HAVE_X86_KERNELS)
