@@ -27,7 +27,8 @@ const KernelSet* FindKernels(KernelVariant variant) {
         case KernelVariant::kAvx2:
             return __builtin_cpu_supports("avx2") ? &Avx2KernelSet() : nullptr;
         case KernelVariant::kAvx512:
-            // The subsets the compiler uses for the AVX-512 kernels.
+            // Every extension the file is compiled with, and AVX2 for the kernels it
+            // takes from the AVX2 set.
             return __builtin_cpu_supports("avx2") && __builtin_cpu_supports("avx512f") &&
                            __builtin_cpu_supports("avx512bw") &&
                            __builtin_cpu_supports("avx512dq") && __builtin_cpu_supports("avx512vl")

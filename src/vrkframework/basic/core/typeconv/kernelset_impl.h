@@ -379,10 +379,15 @@ void Pack(const void* source, unsigned char* packed, std::size_t count, unsigned
     // The special loops end on a byte boundary, where the general packing goes on.
     const T* rest = samples + done;
     unsigned char* const next = packed + done * bits / 8;
-    bits <= 7    ? PackWords<8>(rest, next, count - done, bits)
-    : bits <= 14 ? PackWords<4>(rest, next, count - done, bits)
-    : bits <= 28 ? PackWords<2>(rest, next, count - done, bits)
-                 : PackWords<1>(rest, next, count - done, bits);
+    if (bits <= 7) {
+        PackWords<8>(rest, next, count - done, bits);
+    } else if (bits <= 14) {
+        PackWords<4>(rest, next, count - done, bits);
+    } else if (bits <= 28) {
+        PackWords<2>(rest, next, count - done, bits);
+    } else {
+        PackWords<1>(rest, next, count - done, bits);
+    }
 }
 
 // ---------------------------------------------------------------- the table
