@@ -326,8 +326,8 @@ void CheckPair(const Pair& pair) {
     for (SampleLayout layout : kLayouts) {
         const std::string family = "layout " + std::to_string(static_cast<int>(layout));
         // Every variant this processor runs, over all the values at once and the lengths
-        // that reach vector bodies and tails; 2500 samples cross the complex layouts' blocks.
-        for (KernelVariant variant : {KernelVariant::kBaseline, KernelVariant::kAvx2}) {
+        // that reach vector bodies and tails; 2500 samples cross the real to complex blocks.
+        for (KernelVariant variant : typeconv::detail::kKernelVariants) {
             const KernelSet* kernels = typeconv::detail::FindKernels(variant);
             if (kernels == nullptr) {
                 continue;

@@ -12,18 +12,10 @@ constexpr std::size_t Log2(std::size_t size) {
     return size == 1 ? 0 : size == 2 ? 1 : size == 4 ? 2 : 3;
 }
 
-/// The complex layouts with one component side convert through a small block that stays
-/// in the first-level cache: contiguous conversion, then (de)interleaving, so every pair
-/// shares the contiguous kernels.
+/// Real to complex conversions go through a small block that stays in the first-level
+/// cache: contiguous conversion, then interleaving with zeros, so every pair shares the
+/// contiguous kernels.
 constexpr std::size_t kBlockBytes = 8192;
-
-bool ProcessorHasAvx2() {
-#if defined(KUBO_HAVE_AVX2_KERNELS)
-    return __builtin_cpu_supports("avx2") != 0;
-#else
-    return false;
-#endif
-}
 
 }  // namespace
 
@@ -31,10 +23,20 @@ const KernelSet* FindKernels(KernelVariant variant) {
     switch (variant) {
         case KernelVariant::kBaseline:
             return &BaselineKernelSet();
+#if defined(KUBO_HAVE_X86_KERNELS)
         case KernelVariant::kAvx2:
-#if defined(KUBO_HAVE_AVX2_KERNELS)
-            return ProcessorHasAvx2() ? &Avx2KernelSet() : nullptr;
+            return __builtin_cpu_supports("avx2") ? &Avx2KernelSet() : nullptr;
+        case KernelVariant::kAvx512:
+            // Every extension the file is compiled with, and AVX2 for the kernels it
+            // takes from the AVX2 set.
+            return __builtin_cpu_supports("avx2") && __builtin_cpu_supports("avx512f") &&
+                           __builtin_cpu_supports("avx512bw") &&
+                           __builtin_cpu_supports("avx512dq") && __builtin_cpu_supports("avx512vl")
+                       ? &Avx512KernelSet()
+                       : nullptr;
 #else
+        case KernelVariant::kAvx2:
+        case KernelVariant::kAvx512:
             return nullptr;
 #endif
     }
@@ -42,9 +44,32 @@ const KernelSet* FindKernels(KernelVariant variant) {
 }
 
 const KernelSet& ActiveKernels() {
-    static const KernelSet& active =
-        ProcessorHasAvx2() ? *FindKernels(KernelVariant::kAvx2) : BaselineKernelSet();
+    static const KernelSet& active = []() -> const KernelSet& {
+        for (auto variant = kKernelVariants.rbegin(); variant != kKernelVariants.rend();
+             ++variant) {
+            if (const KernelSet* kernels = FindKernels(*variant)) {
+                return *kernels;
+            }
+        }
+        return BaselineKernelSet();
+    }();
     return active;
+}
+
+KernelSet WithGapsFilled(KernelSet kernels, const KernelSet& fallback) {
+    const auto fill = [](auto& entries, const auto& fallbackEntries) {
+        for (std::size_t i = 0; i < entries.size(); ++i) {
+            entries[i] = entries[i] != nullptr ? entries[i] : fallbackEntries[i];
+        }
+    };
+    for (std::size_t from = 0; from < kComponentCount; ++from) {
+        fill(kernels.convert[from], fallback.convert[from]);
+        fill(kernels.convertRealParts[from], fallback.convertRealParts[from]);
+    }
+    fill(kernels.interleaveWithZeros, fallback.interleaveWithZeros);
+    fill(kernels.unpack, fallback.unpack);
+    fill(kernels.pack, fallback.pack);
+    return kernels;
 }
 
 void RunPromote(const KernelSet& kernels, SampleLayout layout, std::size_t from, std::size_t to,
@@ -57,26 +82,22 @@ void RunPromote(const KernelSet& kernels, SampleLayout layout, std::size_t from,
         case SampleLayout::kComplex:
             convert(src, dst, 2 * count);
             return;
-        case SampleLayout::kRealToComplex:
         case SampleLayout::kComplexToReal:
+            kernels.convertRealParts[from][to](src, dst, count);
+            return;
+        case SampleLayout::kRealToComplex:
             break;
     }
-    const bool toComplex = layout == SampleLayout::kRealToComplex;
     const std::size_t fromSize = kSizeOf[from];
     const std::size_t toSize = kSizeOf[to];
-    const std::size_t blockCount = kBlockBytes / (toComplex ? toSize : fromSize);
+    const std::size_t blockCount = kBlockBytes / toSize;
     alignas(64) unsigned char block[kBlockBytes];
     const auto* in = static_cast<const unsigned char*>(src);
     auto* out = static_cast<unsigned char*>(dst);
     for (std::size_t done = 0; done < count; done += blockCount) {
         const std::size_t n = count - done < blockCount ? count - done : blockCount;
-        if (toComplex) {
-            convert(in + done * fromSize, block, n);
-            kernels.interleaveWithZeros[Log2(toSize)](block, out + 2 * done * toSize, n);
-        } else {
-            kernels.takeRealParts[Log2(fromSize)](in + 2 * done * fromSize, block, n);
-            convert(block, out + done * toSize, n);
-        }
+        convert(in + done * fromSize, block, n);
+        kernels.interleaveWithZeros[Log2(toSize)](block, out + 2 * done * toSize, n);
     }
 }
 

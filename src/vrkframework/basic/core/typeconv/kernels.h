@@ -46,17 +46,21 @@ using PackKernel = void (*)(const void* samples, unsigned char* packed, std::siz
 struct KernelSet {
     /// [source index][destination index]: contiguous values, rule per value.
     std::array<std::array<ConvertKernel, kComponentCount>, kComponentCount> convert;
+    /// [source index][destination index]: the real parts of (real, imaginary) pairs.
+    std::array<std::array<ConvertKernel, kComponentCount>, kComponentCount> convertRealParts;
     /// [log2 of the value size]: values to (value, 0) pairs.
     std::array<ConvertKernel, 4> interleaveWithZeros;
-    /// [log2 of the value size]: (real, imaginary) pairs to their real values.
-    std::array<ConvertKernel, 4> takeRealParts;
     /// [component index]: null for float and double.
     std::array<UnpackKernel, kComponentCount> unpack;
     std::array<PackKernel, kComponentCount> pack;
 };
 
 /// The instruction sets kernels are compiled for.
-enum class KernelVariant { kBaseline, kAvx2 };
+enum class KernelVariant { kBaseline, kAvx2, kAvx512 };
+
+/// Every variant, fastest last.
+constexpr std::array<KernelVariant, 3> kKernelVariants = {
+    KernelVariant::kBaseline, KernelVariant::kAvx2, KernelVariant::kAvx512};
 
 /// The kernels of `variant`, or null when this build or this processor lacks them.
 KUBO_API const KernelSet* FindKernels(KernelVariant variant);
@@ -82,10 +86,14 @@ constexpr std::array<const char*, kComponentCount> kComponentTypeNames = {
     "char",         "unsigned char", "short",  "unsigned short", "int",
     "unsigned int", "float",         "double", "__int64",        "unsigned __int64"};
 
+/// `kernels` with every null kernel replaced by the one of `fallback`.
+KernelSet WithGapsFilled(KernelSet kernels, const KernelSet& fallback);
+
 // Defined by the kernel files, one per instruction set.
 const KernelSet& BaselineKernelSet();
-#if defined(KUBO_HAVE_AVX2_KERNELS)
+#if defined(KUBO_HAVE_X86_KERNELS)
 const KernelSet& Avx2KernelSet();
+const KernelSet& Avx512KernelSet();
 #endif
 
 }  // namespace typeconv::detail

@@ -4,8 +4,9 @@
 #ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_KERNELSET_IMPL_H
 #define VRKFRAMEWORK_BASIC_CORE_TYPECONV_KERNELSET_IMPL_H
 
+#include <algorithm>  // std::min
 #include <cstdint>
-#include <cstring>  // std::memcpy, std::memset
+#include <cstring>  // std::memcpy
 #include <type_traits>
 #include <utility>  // std::index_sequence
 
@@ -18,17 +19,25 @@ namespace {
 
 // ---------------------------------------------------------------- element conversions
 
-template <class A, class B>
+/// Converts every Stride-th value: 1 for contiguous values, 2 for the real parts of
+/// (real, imaginary) pairs, read in place rather than gathered first.
+template <class A, class B, std::size_t Stride>
 void ConvertLoop(const A* __restrict src, B* __restrict dst, std::size_t count) {
     for (std::size_t i = 0; i < count; ++i) {
-        dst[i] = ConvertSample<B>(src[i]);
+        dst[i] = ConvertSample<B>(src[Stride * i]);
     }
 }
 
-template <class A, class B>
+template <class A, class B, std::size_t Stride>
 void Convert(const void* src, void* dst, std::size_t count) {
-    ConvertLoop(static_cast<const A*>(src), static_cast<B*>(dst), count);
+    ConvertLoop<A, B, Stride>(static_cast<const A*>(src), static_cast<B*>(dst), count);
 }
+
+template <std::size_t Size>
+using UnsignedOfSize = std::conditional_t<
+    Size == 1, std::uint8_t,
+    std::conditional_t<Size == 2, std::uint16_t,
+                       std::conditional_t<Size == 4, std::uint32_t, std::uint64_t>>>;
 
 template <std::size_t Size>
 void Copy(const void* src, void* dst, std::size_t count) {
@@ -37,23 +46,35 @@ void Copy(const void* src, void* dst, std::size_t count) {
     }
 }
 
-/// Pairs whose rule is the identity on the bits share the copy; unsigned sources into
-/// wider integers (zero extension) and signed 8/16/32-bit sources into 64-bit integers
-/// (negatives to 0) give the same bits for both signs of the destination and share the
-/// unsigned destination's kernel.
-template <class A, class B>
+/// Pairs whose rule is the identity on the bits share the copy (or, strided, the unsigned
+/// identity); unsigned sources into wider integers (zero extension) and signed 8/16/32-bit
+/// sources into 64-bit integers (negatives to 0) give the same bits for both signs of the
+/// destination and share the unsigned destination's kernel.
+///
+/// AVX-512 brings conversions and clamps of floating values to integers and conversions of
+/// unsigned 32-bit and 64-bit integers to floating values. The other kernels only clamp,
+/// widen, narrow or interleave, and their 512-bit forms stream out of cache slower than the
+/// AVX2 ones: the AVX-512 copy leaves them null, to be taken from the AVX2 set.
+template <class A, class B, std::size_t Stride>
 constexpr ConvertKernel SelectConvertKernel() {
+    constexpr bool kNeedsAvx512 = (std::is_floating_point_v<A> && std::is_integral_v<B>) ||
+                                  (std::is_integral_v<A> && std::is_floating_point_v<B> &&
+                                   (sizeof(A) == 8 || (sizeof(A) == 4 && std::is_unsigned_v<A>)));
     constexpr bool kSameBits =
         sizeof(A) == sizeof(B) && std::is_integral_v<A> && std::is_integral_v<B> &&
         (std::is_signed_v<A> == std::is_signed_v<B> || (std::is_signed_v<A> && sizeof(A) == 8));
-    if constexpr (std::is_same_v<A, B> || kSameBits) {
+    if constexpr (kAvx512 && !kNeedsAvx512) {
+        return nullptr;
+    } else if constexpr ((std::is_same_v<A, B> || kSameBits) && Stride == 1) {
         return &Copy<sizeof(A)>;
+    } else if constexpr (std::is_same_v<A, B> || kSameBits) {
+        return &Convert<UnsignedOfSize<sizeof(A)>, UnsignedOfSize<sizeof(A)>, Stride>;
     } else if constexpr (std::is_integral_v<A> && std::is_integral_v<B> &&
                          (std::is_unsigned_v<A> ? sizeof(B) > sizeof(A)
                                                 : sizeof(B) == 8 && sizeof(A) < 8)) {
-        return &Convert<A, std::make_unsigned_t<B>>;
+        return &Convert<A, std::make_unsigned_t<B>, Stride>;
     } else {
-        return &Convert<A, B>;
+        return &Convert<A, B, Stride>;
     }
 }
 
@@ -67,24 +88,56 @@ void InterleaveWithZeros(const void* values, void* pairs, std::size_t count) {
     }
 }
 
-template <class T>
-void TakeRealParts(const void* pairs, void* values, std::size_t count) {
-    const T* __restrict in = static_cast<const T*>(pairs);
-    T* __restrict out = static_cast<T*>(values);
-    for (std::size_t i = 0; i < count; ++i) {
-        out[i] = in[2 * i];
-    }
-}
-
 // ---------------------------------------------------------------- packed streams
 
-/// The 8 bytes at `bytes` as a big-endian number (one load and a byte swap once compiled).
+#if defined(__BYTE_ORDER__) && __BYTE_ORDER__ == __ORDER_BIG_ENDIAN__
+constexpr bool kLittleEndian = false;
+#else
+constexpr bool kLittleEndian = true;
+#endif
+
+inline std::uint64_t ByteSwap64(std::uint64_t word) {
+#if defined(__GNUC__)
+    return __builtin_bswap64(word);
+#else
+    word = word << 32 | word >> 32;
+    word = (word & 0x0000FFFF0000FFFFu) << 16 | (word >> 16 & 0x0000FFFF0000FFFFu);
+    return (word & 0x00FF00FF00FF00FFu) << 8 | (word >> 8 & 0x00FF00FF00FF00FFu);
+#endif
+}
+
+/// The 8 bytes at `bytes` as a number, the first byte lowest.
+inline std::uint64_t LoadLittleEndian64(const unsigned char* bytes) {
+    std::uint64_t word;
+    std::memcpy(&word, bytes, sizeof word);
+    return kLittleEndian ? word : ByteSwap64(word);
+}
+
+/// The 8 bytes at `bytes` as a number, the first byte highest.
 inline std::uint64_t LoadBigEndian64(const unsigned char* bytes) {
-    std::uint64_t word = 0;
-    for (int k = 0; k < 8; ++k) {
-        word = word << 8 | bytes[k];
-    }
-    return word;
+    std::uint64_t word;
+    std::memcpy(&word, bytes, sizeof word);
+    return kLittleEndian ? ByteSwap64(word) : word;
+}
+
+inline void StoreLittleEndian64(unsigned char* bytes, std::uint64_t word) {
+    word = kLittleEndian ? word : ByteSwap64(word);
+    std::memcpy(bytes, &word, sizeof word);
+}
+
+inline void StoreBigEndian64(unsigned char* bytes, std::uint64_t word) {
+    word = kLittleEndian ? ByteSwap64(word) : word;
+    std::memcpy(bytes, &word, sizeof word);
+}
+
+/// How many leading samples of a `bits`-bit stream of `count` samples start in a byte
+/// followed by at least 7 more stream bytes: 8-byte accesses from their byte stay inside
+/// the stream.
+inline std::size_t SamplesWithWholeWindow(std::size_t count, unsigned int bits) {
+    const std::size_t streamBytes = (count * bits + 7) / 8;
+    // Sample i qualifies while i * bits / 8 <= streamBytes - 8, that is i * bits is
+    // below (streamBytes - 7) * 8.
+    return streamBytes < 8 ? 0 : ((streamBytes - 7) * 8 - 1) / bits + 1;
 }
 
 /// The `bits`-bit sample at stream bit `position`, read byte by byte (never past the
@@ -107,22 +160,35 @@ inline std::uint32_t GatherBits(const unsigned char* packed, std::size_t positio
     return value;
 }
 
-/// One-bit samples: each byte spreads into eight 0/1 values, most significant bit first.
-template <class T>
-void UnpackOneBit(const unsigned char* __restrict packed, T* __restrict samples,
-                  std::size_t count) {
-    for (std::size_t i = 0; i < count / 8; ++i) {
+/// Bits dividing 8: each byte spreads into 8 / Bits samples, most significant bits first.
+/// Returns the samples done (whole bytes), as the other special loops do.
+template <unsigned int Bits, class T>
+std::size_t UnpackWithinBytes(const unsigned char* __restrict packed, T* __restrict samples,
+                              std::size_t count) {
+    constexpr unsigned int kPerByte = 8 / Bits;
+    for (std::size_t i = 0; i < count / kPerByte; ++i) {
         const unsigned int byte = packed[i];
-        for (unsigned int j = 0; j < 8; ++j) {
-            samples[8 * i + j] = static_cast<T>((byte >> (7 - j)) & 1u);
+        if constexpr (Bits == 1 && sizeof(T) == 1 && kAvx512) {
+            // AVX-512 multiplies 64-bit lanes, which makes this the fastest there (the
+            // shifts are elsewhere): a copy of the byte in every byte of the word, masked
+            // to bit 7 - j in byte j; adding 0x7F carries each such bit into bit 7.
+            const std::uint64_t spread = (byte * 0x0101010101010101u) & 0x0102040810204080u;
+            const std::uint64_t ones = (spread + 0x7F7F7F7F7F7F7F7Fu) >> 7 & 0x0101010101010101u;
+            StoreLittleEndian64(reinterpret_cast<unsigned char*>(samples + 8 * i), ones);
+        } else {
+            for (unsigned int j = 0; j < kPerByte; ++j) {
+                samples[kPerByte * i + j] =
+                    static_cast<T>((byte >> (8 - Bits * (j + 1))) & ((1u << Bits) - 1));
+            }
         }
     }
+    return count / kPerByte * kPerByte;
 }
 
 /// Twelve-bit samples: each three bytes hold two samples.
 template <class T>
-void UnpackTwelveBits(const unsigned char* __restrict packed, T* __restrict samples,
-                      std::size_t count) {
+std::size_t UnpackTwelveBits(const unsigned char* __restrict packed, T* __restrict samples,
+                             std::size_t count) {
     for (std::size_t i = 0; i < count / 2; ++i) {
         const unsigned int first = packed[3 * i];
         const unsigned int middle = packed[3 * i + 1];
@@ -130,54 +196,44 @@ void UnpackTwelveBits(const unsigned char* __restrict packed, T* __restrict samp
         samples[2 * i] = static_cast<T>(first << 4 | middle >> 4);
         samples[2 * i + 1] = static_cast<T>((middle & 0xFu) << 8 | last);
     }
+    return count / 2 * 2;
+}
+
+/// Any bit count: one 8-byte load from the byte of every PerWord-th sample feeds that
+/// sample and the PerWord - 1 after it (the first may start 7 bits into the word, so
+/// PerWord * bits is at most 57). Returns the samples done, the rest being left to a
+/// byte-wise tail.
+template <unsigned int PerWord, class T>
+std::size_t UnpackWords(const unsigned char* __restrict packed, T* __restrict samples,
+                        std::size_t count, unsigned int bits) {
+    // Words start at samples below `windowed` that have PerWord samples from them.
+    const std::size_t windowed = SamplesWithWholeWindow(count, bits);
+    const std::size_t end = count < PerWord ? 0 : std::min(windowed, count - PerWord + 1);
+    std::size_t done = 0;
+    for (std::size_t position = 0; done < end; done += PerWord, position += PerWord * bits) {
+        std::uint64_t word = LoadBigEndian64(packed + position / 8) << (position % 8);
+        for (unsigned int j = 0; j < PerWord; ++j) {
+            samples[done + j] = static_cast<T>(word >> (64 - bits));
+            word <<= bits;
+        }
+    }
+    return done;
 }
 
 /// Unpacks into T of the element size (zero extension gives the same bits for both signs).
 template <class T>
 void Unpack(const unsigned char* packed, void* target, std::size_t count, unsigned int bits) {
     T* samples = static_cast<T*>(target);
-    std::size_t done = 0;
-    if (bits == 1) {
-        UnpackOneBit(packed, samples, count);
-        done = count / 8 * 8;
-    } else if (bits == 12) {
-        UnpackTwelveBits(packed, samples, count);
-        done = count / 2 * 2;
-    } else {
-        // A 64-bit window holds any sample (offset up to 7 plus up to 31 bits) as long as
-        // 8 bytes remain readable.
-        const std::size_t streamBytes = (count * bits + 7) / 8;
-        for (; done < count && (done * bits) / 8 + 8 <= streamBytes; ++done) {
-            const std::size_t position = done * bits;
-            const std::uint64_t window = LoadBigEndian64(packed + position / 8);
-            samples[done] = static_cast<T>((window << (position % 8)) >> (64 - bits));
-        }
-    }
+    std::size_t done = bits == 1    ? UnpackWithinBytes<1>(packed, samples, count)
+                       : bits == 2  ? UnpackWithinBytes<2>(packed, samples, count)
+                       : bits == 4  ? UnpackWithinBytes<4>(packed, samples, count)
+                       : bits == 12 ? UnpackTwelveBits(packed, samples, count)
+                       : bits <= 7  ? UnpackWords<8>(packed, samples, count, bits)
+                       : bits <= 14 ? UnpackWords<4>(packed, samples, count, bits)
+                       : bits <= 28 ? UnpackWords<2>(packed, samples, count, bits)
+                                    : UnpackWords<1>(packed, samples, count, bits);
     for (; done < count; ++done) {
         samples[done] = static_cast<T>(GatherBits(packed, done * bits, bits));
-    }
-}
-
-/// ORs one sample into a cleared stream. Within one byte only its `bits` low bits count;
-/// across bytes the first byte receives everything above the bits that follow it,
-/// unmasked, so bits above `bits` - 1 land in the previous sample. `value` is the sample
-/// sign-extended (signed types) or zero-extended to 64 bits.
-inline void PutBits(unsigned char* packed, std::size_t position, unsigned int bits,
-                    std::uint64_t value) {
-    unsigned char* byte = packed + position / 8;
-    const unsigned int available = 8 - static_cast<unsigned int>(position % 8);
-    if (bits <= available) {
-        const std::uint64_t mask = (std::uint64_t{1} << bits) - 1;
-        *byte = static_cast<unsigned char>(*byte | (value & mask) << (available - bits));
-        return;
-    }
-    unsigned int remaining = bits - available;
-    *byte = static_cast<unsigned char>(*byte | value >> remaining);
-    for (; remaining >= 8; remaining -= 8) {
-        *++byte = static_cast<unsigned char>(value >> (remaining - 8));
-    }
-    if (remaining != 0) {
-        *++byte = static_cast<unsigned char>(value << (8 - remaining));
     }
 }
 
@@ -187,23 +243,37 @@ std::uint64_t Widen(T sample) {
     return static_cast<std::uint64_t>(static_cast<Wide>(sample));
 }
 
-/// One-bit samples: eight low bits gathered into one byte, the first sample on top.
-template <class T>
-void PackOneBit(const T* __restrict samples, unsigned char* __restrict packed, std::size_t count) {
-    for (std::size_t i = 0; i < count / 8; ++i) {
-        unsigned int byte = 0;
-        for (unsigned int j = 0; j < 8; ++j) {
-            byte |= (static_cast<unsigned int>(samples[8 * i + j]) & 1u) << (7 - j);
+/// Bits dividing 8: 8 / Bits samples per byte, the first on top. Samples never span two
+/// bytes, so each keeps only its Bits low bits. One-bit byte samples go eight at a time
+/// through a multiplication that moves bit 0 of byte j of the little-endian word to bit
+/// 63 - j; no two partial products share a bit, so nothing carries into the top byte.
+template <unsigned int Bits, class T>
+std::size_t PackWithinBytes(const T* __restrict samples, unsigned char* __restrict packed,
+                            std::size_t count) {
+    constexpr unsigned int kPerByte = 8 / Bits;
+    for (std::size_t i = 0; i < count / kPerByte; ++i) {
+        if constexpr (Bits == 1 && sizeof(T) == 1) {
+            const std::uint64_t lows =
+                LoadLittleEndian64(reinterpret_cast<const unsigned char*>(samples + 8 * i)) &
+                0x0101010101010101u;
+            packed[i] = static_cast<unsigned char>((lows * 0x8040201008040201u) >> 56);
+        } else {
+            unsigned int byte = 0;
+            for (unsigned int j = 0; j < kPerByte; ++j) {
+                byte |= (static_cast<unsigned int>(samples[kPerByte * i + j]) & ((1u << Bits) - 1))
+                        << (8 - Bits * (j + 1));
+            }
+            packed[i] = static_cast<unsigned char>(byte);
         }
-        packed[i] = static_cast<unsigned char>(byte);
     }
+    return count / kPerByte * kPerByte;
 }
 
 /// Twelve-bit samples: two samples into three bytes; the second sample's bits above 11
-/// reach the first sample's low nibble, as PutBits does.
+/// reach the first sample's low nibble, as PackKept describes.
 template <class T>
-void PackTwelveBits(const T* __restrict samples, unsigned char* __restrict packed,
-                    std::size_t count) {
+std::size_t PackTwelveBits(const T* __restrict samples, unsigned char* __restrict packed,
+                           std::size_t count) {
     for (std::size_t i = 0; i < count / 2; ++i) {
         const std::uint64_t first = Widen(samples[2 * i]);
         const std::uint64_t second = Widen(samples[2 * i + 1]);
@@ -211,24 +281,112 @@ void PackTwelveBits(const T* __restrict samples, unsigned char* __restrict packe
         packed[3 * i + 1] = static_cast<unsigned char>(first << 4 | second >> 8);
         packed[3 * i + 2] = static_cast<unsigned char>(second);
     }
+    return count / 2 * 2;
+}
+
+/// The bits a `bits`-bit sample leaves in a cleared stream at `offset` bits into a byte:
+/// within one byte its `bits` low bits; across bytes also the `offset` bits above them,
+/// which the first byte receives unmasked (so they land in the previous sample).
+inline std::uint64_t PackKept(std::uint64_t value, unsigned int bits, unsigned int offset) {
+    const unsigned int spill = offset + bits > 8 ? offset : 0;
+    return value & (~std::uint64_t{0} >> (64 - bits - spill));
+}
+
+/// Writes a stream from a byte boundary on. The top m_fill bits of m_pending (fewer than
+/// 8 between appends) begin the byte at m_next; the bytes before it are final. Bytes are
+/// stored, not ORed, so the stream needs no clearing first.
+class BitWriter {
+public:
+    explicit BitWriter(unsigned char* next) : m_next(next) {}
+
+    /// The offset of the next sample in its byte.
+    unsigned int GetOffsetInByte() const { return m_fill; }
+
+    /// Appends `bits` bits (at most 56) from `word`; bits of `word` above them are ORed
+    /// into the pending bits before. Stores 8 bytes from m_next, which must be writable.
+    void Append(std::uint64_t word, unsigned int bits) {
+        m_pending |= word << (64 - m_fill - bits);
+        m_fill += bits;
+        StoreBigEndian64(m_next, m_pending);
+        m_next += m_fill / 8;
+        m_pending <<= m_fill / 8 * 8;
+        m_fill %= 8;
+    }
+
+    /// The same, storing only the completed bytes: near the end of the stream.
+    void AppendNearEnd(std::uint64_t word, unsigned int bits) {
+        m_pending |= word << (64 - m_fill - bits);
+        for (m_fill += bits; m_fill >= 8; m_fill -= 8) {
+            *m_next++ = static_cast<unsigned char>(m_pending >> 56);
+            m_pending <<= 8;
+        }
+    }
+
+    /// Stores the last, partial byte (its unused low bits 0).
+    void Finish() {
+        if (m_fill != 0) {
+            *m_next = static_cast<unsigned char>(m_pending >> 56);
+        }
+    }
+
+private:
+    unsigned char* m_next;
+    std::uint64_t m_pending = 0;
+    unsigned int m_fill = 0;
+};
+
+/// Any bit count, PerWord samples per append (PerWord * bits at most 56). Blocks whose
+/// samples all fit in `bits` bits (the usual case) go a word at a time while 8 bytes of
+/// stream remain; other samples go one by one with their exact over-wide bits.
+template <unsigned int PerWord, class T>
+void PackWords(const T* __restrict samples, unsigned char* __restrict packed, std::size_t count,
+               unsigned int bits) {
+    constexpr std::size_t kBlock = 256;
+    const std::size_t windowed = SamplesWithWholeWindow(count, bits);
+    BitWriter writer(packed);
+    for (std::size_t done = 0; done < count; done += kBlock) {
+        const std::size_t n = count - done < kBlock ? count - done : kBlock;
+        const T* block = samples + done;
+        std::uint64_t over = 0;
+        for (std::size_t i = 0; i < n; ++i) {
+            over |= Widen(block[i]) >> bits;
+        }
+        std::size_t i = 0;
+        if (over == 0) {
+            for (; i + PerWord <= n && done + i < windowed; i += PerWord) {
+                std::uint64_t word = 0;
+                for (unsigned int j = 0; j < PerWord; ++j) {
+                    word |= Widen(block[i + j]) << (PerWord - 1 - j) * bits;
+                }
+                writer.Append(word, PerWord * bits);
+            }
+        }
+        for (; i < n; ++i) {
+            writer.AppendNearEnd(PackKept(Widen(block[i]), bits, writer.GetOffsetInByte()), bits);
+        }
+    }
+    writer.Finish();
 }
 
 template <class T>
 void Pack(const void* source, unsigned char* packed, std::size_t count, unsigned int bits) {
     const T* samples = static_cast<const T*>(source);
-    // The byte count is formed in 32-bit unsigned arithmetic, as the stream limit implies.
-    const std::uint32_t bytes = (static_cast<std::uint32_t>(count) * bits + 7u) / 8u;
-    std::memset(packed, 0, bytes);
-    std::size_t done = 0;
-    if (bits == 1) {
-        PackOneBit(samples, packed, count);
-        done = count / 8 * 8;
-    } else if (bits == 12) {
-        PackTwelveBits(samples, packed, count);
-        done = count / 2 * 2;
-    }
-    for (; done < count; ++done) {
-        PutBits(packed, done * bits, bits, Widen(samples[done]));
+    const std::size_t done = bits == 1    ? PackWithinBytes<1>(samples, packed, count)
+                             : bits == 2  ? PackWithinBytes<2>(samples, packed, count)
+                             : bits == 4  ? PackWithinBytes<4>(samples, packed, count)
+                             : bits == 12 ? PackTwelveBits(samples, packed, count)
+                                          : 0;
+    // The special loops end on a byte boundary, where the general packing goes on.
+    const T* rest = samples + done;
+    unsigned char* const next = packed + done * bits / 8;
+    if (bits <= 7) {
+        PackWords<8>(rest, next, count - done, bits);
+    } else if (bits <= 14) {
+        PackWords<4>(rest, next, count - done, bits);
+    } else if (bits <= 28) {
+        PackWords<2>(rest, next, count - done, bits);
+    } else {
+        PackWords<1>(rest, next, count - done, bits);
     }
 }
 
@@ -244,9 +402,9 @@ struct ComponentAt<0, List> {
 template <std::size_t Index>
 using Component = typename ComponentAt<Index>::type;
 
-template <class A, std::size_t... To>
+template <class A, std::size_t Stride, std::size_t... To>
 constexpr std::array<ConvertKernel, kComponentCount> MakeConvertRow(std::index_sequence<To...>) {
-    return {{SelectConvertKernel<A, Component<To>>()...}};
+    return {{SelectConvertKernel<A, Component<To>, Stride>()...}};
 }
 
 template <class T>
@@ -270,11 +428,13 @@ constexpr PackKernel SelectPackKernel() {
 template <std::size_t... Index>
 constexpr KernelSet MakeKernelSet(std::index_sequence<Index...> indices) {
     return KernelSet{
-        {{MakeConvertRow<Component<Index>>(indices)...}},
-        {{&InterleaveWithZeros<std::uint8_t>, &InterleaveWithZeros<std::uint16_t>,
-          &InterleaveWithZeros<std::uint32_t>, &InterleaveWithZeros<std::uint64_t>}},
-        {{&TakeRealParts<std::uint8_t>, &TakeRealParts<std::uint16_t>,
-          &TakeRealParts<std::uint32_t>, &TakeRealParts<std::uint64_t>}},
+        {{MakeConvertRow<Component<Index>, 1>(indices)...}},
+        {{MakeConvertRow<Component<Index>, 2>(indices)...}},
+        kAvx512 ? std::array<ConvertKernel, 4>{}
+                : std::array<ConvertKernel, 4>{{&InterleaveWithZeros<std::uint8_t>,
+                                                &InterleaveWithZeros<std::uint16_t>,
+                                                &InterleaveWithZeros<std::uint32_t>,
+                                                &InterleaveWithZeros<std::uint64_t>}},
         {{SelectUnpackKernel<Component<Index>>()...}},
         {{SelectPackKernel<Component<Index>>()...}},
     };

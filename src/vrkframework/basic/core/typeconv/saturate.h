@@ -24,6 +24,21 @@ constexpr bool kIsUnsigned64 = std::is_integral_v<T>&& std::is_unsigned_v<T> && 
 template <class T>
 constexpr bool kIsNarrowSigned = std::is_integral_v<T>&& std::is_signed_v<T> && sizeof(T) < 8;
 
+/// The instruction set this copy is compiled for. AVX-512 (F, DQ, VL) converts directly
+/// between floating values and unsigned 32-bit or any 64-bit integers, and has min and max
+/// of unsigned and 64-bit lanes; there plain conversions vectorise. Elsewhere the helpers
+/// build the same results from signed 32-bit conversions.
+#if defined(__AVX512F__) && defined(__AVX512DQ__) && defined(__AVX512VL__)
+constexpr bool kAvx512 = true;
+#else
+constexpr bool kAvx512 = false;
+#endif
+#if defined(__AVX2__)
+constexpr bool kAvx2 = true;
+#else
+constexpr bool kAvx2 = false;
+#endif
+
 template <class To, class From>
 inline To BitCast(From value) {
     static_assert(sizeof(To) == sizeof(From), "bit casts keep the size");
@@ -129,7 +144,7 @@ inline float Int64ToFloat(A x) {
 
 template <class B, class A>
 inline B IntegerToFloating(A x) {
-    if constexpr (sizeof(A) < 4 || (sizeof(A) == 4 && std::is_signed_v<A>)) {
+    if constexpr (sizeof(A) < 4 || (sizeof(A) == 4 && std::is_signed_v<A>) || kAvx512) {
         return static_cast<B>(x);
     } else if constexpr (sizeof(A) == 4) {
         return UInt32ToFloating<B>(x);
@@ -152,57 +167,93 @@ constexpr A LargestConvertibleBelow(A limit) {
                : limit - limit * std::numeric_limits<A>::epsilon() / 2;
 }
 
+/// The signed type a clamped A within the 32-bit range truncates through: under AVX-512
+/// a double converts to 64-bit lanes, like its own, which narrow faster than 32-bit ones.
+template <class A>
+using Truncation = std::conditional_t<kAvx512 && sizeof(A) == 8, std::int64_t, std::int32_t>;
+
 /// Truncates c in [0, 2^32).
 template <class A>
 inline std::uint32_t TruncateToUInt32(A c) {
-#if defined(__AVX2__)
-    // trunc(c) + 2^52 holds the integer in the low bits of its mantissa.
-    return static_cast<std::uint32_t>(
-        BitCast<std::uint64_t>(std::trunc(static_cast<double>(c)) + 0x1p52));
-#else
-    // Signed 32-bit conversions of the value below 2^31 and of the value less 2^31.
-    constexpr A kTwo31 = A(2147483648.0);
-    const bool high = c >= kTwo31;
-    // Subtracting a selected constant, not selecting a difference: a floating operation
-    // inside a select is not evaluated for every lane, which blocks vectorisation.
-    const std::int32_t low = static_cast<std::int32_t>(c - (high ? kTwo31 : A(0)));
-    return static_cast<std::uint32_t>(low) + (high ? 0x80000000u : 0u);
-#endif
+    if constexpr (kAvx512) {
+        using Direct = std::conditional_t<sizeof(A) == 8, std::int64_t, std::uint32_t>;
+        return static_cast<std::uint32_t>(static_cast<Direct>(c));
+    } else if constexpr (kAvx2) {
+        // trunc(c) + 2^52 holds the integer in the low bits of its mantissa.
+        return static_cast<std::uint32_t>(
+            BitCast<std::uint64_t>(std::trunc(static_cast<double>(c)) + 0x1p52));
+    } else {
+        // Signed 32-bit conversions of the value below 2^31 and of the value less 2^31.
+        constexpr A kTwo31 = A(2147483648.0);
+        const bool high = c >= kTwo31;
+        // Subtracting a selected constant, not selecting a difference: a floating operation
+        // inside a select is not evaluated for every lane, which blocks vectorisation.
+        const std::int32_t low = static_cast<std::int32_t>(c - (high ? kTwo31 : A(0)));
+        return static_cast<std::uint32_t>(low) + (high ? 0x80000000u : 0u);
+    }
 }
 
 /// Truncates c in [0, 2^64).
 template <class A>
 inline std::uint64_t TruncateToUInt64(A c) {
-#if defined(__AVX2__)
-    // AVX2 has no 64-bit conversion: the two halves of trunc(c) are exact doubles below
-    // 2^32, and each reads as an integer from the mantissa of its sum with 2^52.
-    const double whole = std::trunc(static_cast<double>(c));
-    const double high = std::trunc(whole * 0x1p-32);
-    const double low = whole - high * 0x1p32;
-    const std::uint64_t bias = BitCast<std::uint64_t>(0x1p52);
-    return (BitCast<std::uint64_t>(high + 0x1p52) ^ bias) << 32 |
-           (BitCast<std::uint64_t>(low + 0x1p52) ^ bias);
-#else
-    constexpr A kTwo63 = A(9223372036854775808.0);
-    const bool high = c >= kTwo63;
-    const std::int64_t low = static_cast<std::int64_t>(c - (high ? kTwo63 : A(0)));
-    return static_cast<std::uint64_t>(low) + (high ? std::uint64_t{1} << 63 : 0u);
-#endif
+    if constexpr (kAvx512) {
+        return static_cast<std::uint64_t>(c);
+    } else if constexpr (kAvx2) {
+        // AVX2 has no 64-bit conversion: the two halves of trunc(c) are exact doubles below
+        // 2^32, and each reads as an integer from the mantissa of its sum with 2^52.
+        const double whole = std::trunc(static_cast<double>(c));
+        const double high = std::trunc(whole * 0x1p-32);
+        const double low = whole - high * 0x1p32;
+        const std::uint64_t bias = BitCast<std::uint64_t>(0x1p52);
+        return (BitCast<std::uint64_t>(high + 0x1p52) ^ bias) << 32 |
+               (BitCast<std::uint64_t>(low + 0x1p52) ^ bias);
+    } else {
+        constexpr A kTwo63 = A(9223372036854775808.0);
+        const bool high = c >= kTwo63;
+        const std::int64_t low = static_cast<std::int64_t>(c - (high ? kTwo63 : A(0)));
+        return static_cast<std::uint64_t>(low) + (high ? std::uint64_t{1} << 63 : 0u);
+    }
 }
 
-/// Clamps y to [+0, limit] (limit at least 0; NaN gives +0) on its bit pattern: positive
-/// floating values order like their bits read as signed integers and every negative one
-/// (-0 too) reads below +0. Integer min and max vectorise where floating selects feeding
-/// a conversion end up as selects on the converted, narrowed values.
+/// The bit pattern of a float or double read as a signed integer.
+template <class A>
+using SignedBits = std::conditional_t<sizeof(A) == 4, std::int32_t, std::int64_t>;
+
+/// Clamps y, at least +0 or NaN, to [+0, limit] on its bit pattern (NaN gives +0):
+/// non-negative floating values order like their bits read as signed integers. Integer
+/// min and max vectorise where floating selects feeding a conversion end up as selects on
+/// the converted, narrowed values.
+template <class A>
+inline A ClampNonNegative(A y, A limit) {
+    constexpr SignedBits<A> kInfinity =
+        static_cast<SignedBits<A>>(sizeof(A) == 4 ? 0x7F800000 : 0x7FF0000000000000);
+    const SignedBits<A> bits = BitCast<SignedBits<A>>(y);
+    const SignedBits<A> limitBits = BitCast<SignedBits<A>>(limit);
+    const SignedBits<A> clamped = bits < limitBits ? bits : limitBits;
+    return BitCast<A>(bits > kInfinity ? SignedBits<A>{0} : clamped);
+}
+
+/// Clamps y to [+0, limit] (limit at least 0; NaN gives +0): every negative value (-0
+/// too) reads below +0 as a signed integer.
 template <class A>
 inline A ClampMagnitude(A y, A limit) {
-    using Bits = std::conditional_t<sizeof(A) == 4, std::int32_t, std::int64_t>;
-    constexpr Bits kInfinity = static_cast<Bits>(sizeof(A) == 4 ? 0x7F800000 : 0x7FF0000000000000);
-    const Bits bits = BitCast<Bits>(y);
-    const Bits limitBits = BitCast<Bits>(limit);
-    Bits clamped = bits > 0 ? bits : 0;
-    clamped = clamped < limitBits ? clamped : limitBits;
-    return BitCast<A>(bits > kInfinity ? Bits{0} : clamped);
+    const SignedBits<A> bits = BitCast<SignedBits<A>>(y);
+    return ClampNonNegative(BitCast<A>(bits > 0 ? bits : SignedBits<A>{0}), limit);
+}
+
+/// Clamps y to [low, high] (low below 0 below high; NaN gives `nan`) on its bit pattern:
+/// read as unsigned, the negative values lie above the positive ones and grow with their
+/// magnitude; read as signed, they lie below. AVX-512 has both minimums for both widths.
+template <class A>
+inline A ClampOnBits(A y, A low, A high, A nan) {
+    using Bits = SignedBits<A>;
+    using UnsignedBits = std::make_unsigned_t<Bits>;
+    const UnsignedBits lowBits = BitCast<UnsignedBits>(low);
+    const UnsignedBits unsignedBits = BitCast<UnsignedBits>(y);
+    const Bits aboveLow = static_cast<Bits>(unsignedBits < lowBits ? unsignedBits : lowBits);
+    const Bits highBits = BitCast<Bits>(high);
+    const Bits clamped = aboveLow < highBits ? aboveLow : highBits;
+    return BitCast<A>(y == y ? clamped : BitCast<Bits>(nan));
 }
 
 /// float or double into char, short, int: y = x + 0.5 at or above 0, x - 0.5 below (half
@@ -213,15 +264,24 @@ template <class B, class A>
 inline B FloatingToNarrowSigned(A x) {
     constexpr A kHigh = static_cast<A>(std::numeric_limits<B>::max());
     constexpr A kLow = static_cast<A>(std::numeric_limits<B>::lowest());
-    if constexpr (sizeof(B) < 4) {
+    constexpr A kCeiling = LargestConvertibleBelow<A, B>(kHigh);
+    constexpr std::int32_t kMax = std::numeric_limits<B>::max();
+    if constexpr (kAvx512) {
+        const A y = x + std::copysign(A(0.5), x);
+        const A c = ClampOnBits(y, kLow, kCeiling, sizeof(B) < 4 ? A(0) : kLow);
+        const B value = static_cast<B>(static_cast<Truncation<A>>(c));
+        if constexpr (kCeiling == kHigh) {
+            return value;
+        } else {
+            return y >= kHigh ? static_cast<B>(kMax) : value;
+        }
+    } else if constexpr (sizeof(B) < 4) {
         // On the magnitude: |y| = |x| + 0.5 rounds like y in both directions; clamped to
         // -minimum, truncated, signed, then capped at the maximum.
-        const A magnitude = ClampMagnitude(std::fabs(x) + A(0.5), -kLow);
+        const A magnitude = ClampNonNegative(std::fabs(x) + A(0.5), -kLow);
         const std::int32_t value = static_cast<std::int32_t>(std::copysign(magnitude, x));
-        constexpr std::int32_t kMax = std::numeric_limits<B>::max();
         return static_cast<B>(value < kMax ? value : kMax);
     } else {
-        constexpr A kCeiling = LargestConvertibleBelow<A, B>(kHigh);
         const A y = x + (x >= A(0) ? A(0.5) : A(-0.5));
         A c = y > kLow ? y : kLow;  // NaN takes kLow, INT32_MIN, here
         c = c < kCeiling ? c : kCeiling;
@@ -242,7 +302,7 @@ inline B FloatingToNarrowUnsigned(A x) {
     const A y = x + A(0.5);
     const A c = ClampMagnitude(y, kCeiling);
     if constexpr (sizeof(B) < 4) {
-        return static_cast<B>(static_cast<std::int32_t>(c));
+        return static_cast<B>(static_cast<Truncation<A>>(c));
     } else if constexpr (kCeiling == kHigh) {
         return TruncateToUInt32(c);
     } else {
