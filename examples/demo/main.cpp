@@ -232,8 +232,9 @@ std::vector<unsigned char> ColourScene(Raster& heights) {
         }
     }
     const double seconds = clock.Seconds();
-    demo::Line("stretch+colour", "LUT %.0f/%.0f/%.0f -> 0/110/255, %u-colour PCT, %.1f ns/pixel",
-               p[0], p[1], p[2], palette.GetEntryCount(),
+    demo::Line("stretch+colour",
+               "LUT %.0f/%.0f/%.0f -> 0/110/255, %u-colour PCT, hillshade: %.1f ns/pixel", p[0],
+               p[1], p[2], palette.GetEntryCount(),
                seconds * 1e9 / static_cast<double>(PixelCount(heights)));
     return rgb;
 }
