@@ -51,15 +51,15 @@ void Copy(const void* src, void* dst, std::size_t count) {
 /// sources into 64-bit integers (negatives to 0) give the same bits for both signs of the
 /// destination and share the unsigned destination's kernel.
 ///
-/// AVX-512 brings conversions and clamps of floating values to integers and conversions of
-/// unsigned 32-bit and 64-bit integers to floating values. The other kernels only clamp,
+/// AVX-512 brings conversions and clamps of floating values to integers, conversions of
+/// unsigned 32-bit and 64-bit integers to floating values, and integer to floating
+/// widenings that write twice the bytes per instruction. The other kernels only clamp,
 /// widen, narrow or interleave, and their 512-bit forms stream out of cache slower than the
 /// AVX2 ones: the AVX-512 copy leaves them null, to be taken from the AVX2 set.
 template <class A, class B, std::size_t Stride>
 constexpr ConvertKernel SelectConvertKernel() {
     constexpr bool kNeedsAvx512 = (std::is_floating_point_v<A> && std::is_integral_v<B>) ||
-                                  (std::is_integral_v<A> && std::is_floating_point_v<B> &&
-                                   (sizeof(A) == 8 || (sizeof(A) == 4 && std::is_unsigned_v<A>)));
+                                  (std::is_integral_v<A> && std::is_floating_point_v<B>);
     constexpr bool kSameBits =
         sizeof(A) == sizeof(B) && std::is_integral_v<A> && std::is_integral_v<B> &&
         (std::is_signed_v<A> == std::is_signed_v<B> || (std::is_signed_v<A> && sizeof(A) == 8));
