@@ -10,9 +10,9 @@
 #include "support/expectfailure.h"
 #include "vrkframework/basic/core/typeconv/complex2realpromote.h"
 #include "vrkframework/basic/core/typeconv/complexpromote.h"
+#include "vrkframework/basic/core/typeconv/packedpromote.h"
 #include "vrkframework/basic/core/typeconv/promote.h"
 #include "vrkframework/basic/core/typeconv/real2complexpromote.h"
-#include "vrkframework/basic/core/typeconv/specialpromote.h"
 #include "vrkframework/basic/kubo/raster/datatype.h"
 
 namespace {

@@ -14,7 +14,7 @@
 
 #include "support/expectfailure.h"
 #include "vrkframework/basic/core/typeconv/kernels.h"
-#include "vrkframework/basic/core/typeconv/specialpromote.h"
+#include "vrkframework/basic/core/typeconv/packedpromote.h"
 #include "vrkframework/basic/kubo/raster/datatype.h"
 #include "vrkframework/basic/kubo/raster/promotefactory.h"
 

@@ -6,7 +6,7 @@
 #include <type_traits>
 #include <utility>  // std::index_sequence
 
-#include "vrkframework/basic/core/typeconv/specialpromote.h"
+#include "vrkframework/basic/core/typeconv/packedpromote.h"
 #include "vrkframework/basic/kubo/raster/datatype.h"
 #include "vrkframework/basic/kubo/raster/promotefactory.h"
 

@@ -1,10 +1,10 @@
 // Member bodies of the bit-depth kernels and of SpecialPromote.
-#ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_SPECIALPROMOTE_IMPL_H
-#define VRKFRAMEWORK_BASIC_CORE_TYPECONV_SPECIALPROMOTE_IMPL_H
+#ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_PACKEDPROMOTE_IMPL_H
+#define VRKFRAMEWORK_BASIC_CORE_TYPECONV_PACKEDPROMOTE_IMPL_H
 
 #include "vrkframework/basic/core/typeconv/bitdepthpromote.h"
 #include "vrkframework/basic/core/typeconv/kernels.h"
-#include "vrkframework/basic/core/typeconv/specialpromote.h"
+#include "vrkframework/basic/core/typeconv/packedpromote.h"
 
 namespace typeconv {
 
@@ -54,4 +54,4 @@ unsigned int SpecialPromote<N, T, S>::GetOutputBits() const {
 
 }  // namespace typeconv
 
-#endif  // VRKFRAMEWORK_BASIC_CORE_TYPECONV_SPECIALPROMOTE_IMPL_H
+#endif  // VRKFRAMEWORK_BASIC_CORE_TYPECONV_PACKEDPROMOTE_IMPL_H

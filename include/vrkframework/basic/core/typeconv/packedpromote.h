@@ -1,6 +1,6 @@
 // The converters between packed N-bit streams and whole-byte integer samples.
-#ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_SPECIALPROMOTE_H
-#define VRKFRAMEWORK_BASIC_CORE_TYPECONV_SPECIALPROMOTE_H
+#ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_PACKEDPROMOTE_H
+#define VRKFRAMEWORK_BASIC_CORE_TYPECONV_PACKEDPROMOTE_H
 
 #include "vrkframework/basic/core/typeconv/bitdepthpromote.h"
 #include "vrkframework/basic/core/typeconv/ipromote.h"
@@ -31,4 +31,4 @@ KUBO_FOR_EACH_PACKED_LAYOUT(KUBO_DETAIL_EXTERN_SPECIAL)
 
 }  // namespace typeconv
 
-#endif  // VRKFRAMEWORK_BASIC_CORE_TYPECONV_SPECIALPROMOTE_H
+#endif  // VRKFRAMEWORK_BASIC_CORE_TYPECONV_PACKEDPROMOTE_H

@@ -1,7 +1,7 @@
 // The bit-depth kernels and packed converters of every bit count and integer type.
-#include "vrkframework/basic/core/typeconv/specialpromote.h"
+#include "vrkframework/basic/core/typeconv/packedpromote.h"
 
-#include "vrkframework/basic/core/typeconv/specialpromote_impl.h"
+#include "vrkframework/basic/core/typeconv/packedpromote_impl.h"
 
 namespace typeconv {
 
