@@ -7,13 +7,17 @@
 
 #include <algorithm>
 #include <climits>
+#include <functional>
 #include <memory>
+#include <string>
 #include <tuple>
 #include <utility>
 #include <vector>
 
+#include "support/expectfailure.h"
 #include "vrkframework/basic/kubo/masks/coordinatemaskbuilder.h"
 #include "vrkframework/basic/kubo/masks/flagpacking.h"
+#include "vrkframework/basic/kubo/masks/maskdecisionbuilder.h"
 #include "vrkframework/basic/kubo/raster/raster.h"
 
 namespace {
@@ -42,6 +46,51 @@ TEST(Mask, DescribesOneBitPerPixelOfTheFullExtentAllBackground) {
     EXPECT_EQ(std::make_tuple(mask.GetFullWidth(), mask.GetFullHeight(), mask.GetBitCount()),
               std::make_tuple(7, 3, 21u));
     EXPECT_EQ(BytesOf(mask), Bytes(3, 0));
+}
+
+// The sizes of a mask are 32-bit fields: a full extent past INT_MAX a side or past
+// 2^32 - 1 bits cannot be a mask. The mask and both builders refuse it before any work,
+// with the full extent in the message; the raster here only describes, it holds nothing.
+TEST(Mask, RefusesExtentsPast32BitSizes) {
+    Raster gigapixel;
+    gigapixel.width = gigapixel.height = 66000;
+    gigapixel.xMargin = gigapixel.yMargin = 1;
+    gigapixel.channels = 1;
+    gigapixel.dataType = DataType::Type8U;
+    const std::string message =
+        "A mask of 66002 x 66002 pixels (margins included) exceeds the 4294967295 bits a mask "
+        "holds";
+    const struct {
+        std::function<void()> build;
+        const char* source;
+        const char* function;
+    } builders[] = {
+        {[&] { Mask(gigapixel, gigapixel); }, "vrkframework/basic/kubo/masks/mask",
+         "__cdecl kora::kubo::Mask::Mask(const class kora::kubo::RasterInfo &,const class "
+         "kora::kubo::RasterContext &)"},
+        {[&] { delete CoordinateMaskBuilder().BuildMask(gigapixel); },
+         "vrkframework/basic/kubo/masks/coordinatemaskbuilder",
+         "class kora::kubo::Mask *__cdecl kora::kubo::CoordinateMaskBuilder::BuildMask(const "
+         "class kora::kubo::Raster &) const"},
+        {[&] { delete MaskDecisionBuilder(0.0, BkgdAnyChan).BuildMask(gigapixel); },
+         "vrkframework/basic/kubo/masks/maskdecisionbuilder",
+         "class kora::kubo::Mask *__cdecl kora::kubo::MaskDecisionBuilder::BuildMask(const class "
+         "kora::kubo::Raster &) const"},
+    };
+    for (const auto& b : builders) {
+        const auto failure = kubo_test::Catch<kora::OutOfBoundsException>(b.build);
+        ASSERT_TRUE(failure.has_value()) << b.source;
+        kubo_test::ExpectReport(*failure, message.c_str(), b.source, b.function, 0);
+        EXPECT_EQ(failure->GetValues(), (std::vector<int>{66002, 66002}));
+    }
+    // One side past INT_MAX, though the bit count would fit.
+    const auto wide = kubo_test::Catch<kora::OutOfBoundsException>(
+        [] { Mask(RasterInfo(2147483647u, 1, 1, DataType::Type8U), RasterContext(1, 0, 0, 0)); });
+    ASSERT_TRUE(wide.has_value());
+    EXPECT_EQ(wide->GetMessage(),
+              "A mask of 2147483649 x 1 pixels (margins included) exceeds the 4294967295 bits a "
+              "mask holds");
+    EXPECT_EQ(wide->GetValues(), (std::vector<int>{INT_MAX, 1}));
 }
 
 // Bit r x fullWidth + c is pixel (r, c), most significant bit first, rows not padded, any

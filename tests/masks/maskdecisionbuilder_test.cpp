@@ -207,6 +207,44 @@ TEST(MaskDecisionBuilder, PiecesOfALargeRasterGiveEveryPixelsFlag) {
     }
 }
 
+// Under the pair rule three channels pair the third with the next pixel's first, also
+// across the pieces the builder evaluates a large raster in; the last pixel has no partner.
+TEST(MaskDecisionBuilder, OddPairsReachIntoTheNextPixelAcrossPieces) {
+    // 4099 pixels of (0, 5, 0): only the third sample and the next pixel's first match, so
+    // every pixel is background but the last. Pixel 2048, the first of the second piece,
+    // starts with 5: pixel 2047 loses its partner.
+    Raster raster(RasterInfo(4099, 1, 3, DataType::Type8U), RasterContext());
+    for (std::size_t i = 0; i < raster.byteSize; ++i) {
+        raster.data[i] = i % 3 == 1 ? 5 : 0;
+    }
+    raster.data[3 * 2048] = 5;
+    Flags expected(4099, 0);
+    expected[2047] = expected[4098] = 1;
+    const std::unique_ptr<Mask> same(
+        MaskDecisionBuilder(0.0, BkgdChanPairs, {1, 2, 3}).BuildMask(raster));
+    EXPECT_EQ(BitsOf(*same), expected);
+    const std::unique_ptr<Mask> byPosition(
+        MaskDecisionBuilder({0.0, 7.0, 0.0}, BkgdChanPairs, {1, 2, 3}).BuildMask(raster));
+    EXPECT_EQ(BitsOf(*byPosition), expected);
+}
+
+// A decision derived from the library's own is evaluated through its override.
+TEST(MaskDecisionBuilder, CallsTheEvaluateOfAClassDerivedFromMaskDecision) {
+    struct EveryPixelValid : MaskDecision {
+        EveryPixelValid() : MaskDecision(BkgdAnyChan, {0}, {}, false) {}
+        using MaskDecision::Evaluate;
+        void Evaluate(const Raster& raster, unsigned char* flags) override {
+            std::fill(flags, flags + std::size_t{raster.lineStride} * raster.bufferHeight, 1);
+        }
+        IMaskDecision* Clone() const override { return new EveryPixelValid(*this); }
+    };
+    Raster raster(RasterInfo(2, 2, 1, DataType::Type8U), RasterContext());
+    std::fill(raster.data, raster.data + raster.byteSize, 0);
+    const EveryPixelValid decision;
+    EXPECT_EQ(BitsOf(*std::unique_ptr<Mask>(MaskDecisionBuilder(&decision).BuildMask(raster))),
+              Flags(4, 1));
+}
+
 // A client's decision: every third pixel of the extent valid. Its copies share `instances`,
 // whose use count counts them.
 struct EveryThirdPixel : IMaskDecision {

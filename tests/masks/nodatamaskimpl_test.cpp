@@ -57,27 +57,37 @@ struct Channel {
 };
 
 // Every combination of matching and differing samples over 1003 pixels, so that vector
-// bodies and tails both run, against the flags the rule gives.
+// bodies and tails both run, against the flags the rule gives. Under the pair rule an odd
+// stride pairs the last sample with the next pixel's first, tested as channel 1; the last
+// pixel has no next one.
 template <class T>
 void ExpectFlags(IMaskDecisionImpl& kernel, BkgdRule rule, const std::vector<Channel>& channels) {
     const std::size_t stride = channels.size();
     const std::size_t count = 1003;
     std::vector<T> samples(count * stride);
-    Flags expected(count);
+    std::vector<bool> hits(count * stride + 1, false);
     for (std::size_t i = 0; i < count; ++i) {
         const std::size_t pattern = (i * 37) % (std::size_t{1} << stride);
-        bool background = rule == BkgdAllChans;
-        bool previousHit = false;
         for (std::size_t k = 0; k < stride; ++k) {
             const bool equal = (pattern >> k) & 1;
             samples[i * stride + k] = static_cast<T>(channels[k].value + (equal ? 0 : 20));
-            const bool hit = equal && channels[k].tested;
+            hits[i * stride + k] = equal && channels[k].tested;
+        }
+    }
+    Flags expected(count);
+    for (std::size_t i = 0; i < count; ++i) {
+        bool background = rule == BkgdAllChans;
+        for (std::size_t k = 0; k < stride; ++k) {
+            const bool hit = hits[i * stride + k];
             if (rule == BkgdAllChans) {
                 background = background && (hit || !channels[k].tested);
-            } else if (rule == BkgdAnyChan || k % 2 == 1) {
-                background = background || (hit && (rule == BkgdAnyChan || previousHit));
+            } else if (rule == BkgdAnyChan) {
+                background = background || hit;
+            } else if (k % 2 == 0) {
+                const bool partner =
+                    k + 1 < stride || i + 1 < count ? hits[i * stride + k + 1] : false;
+                background = background || (hit && partner);
             }
-            previousHit = hit;
         }
         expected[i] = background ? 0 : 1;
     }

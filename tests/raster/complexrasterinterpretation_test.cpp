@@ -99,14 +99,46 @@ TEST(ComplexInterpretation, ConvertsTheWholeBufferMarginsIncluded) {
               std::vector<unsigned int>({3, 2, 2, 1, 2, 5, 6}));
     ASSERT_TRUE(out->ownsData);
     EXPECT_EQ(Floats(*out), imaginary);
-    // An existing output takes the input's sample count whatever its own geometry; an owned
-    // one smaller than the input takes what it holds and no more.
+    // An existing output takes the input's sample count whatever its own geometry.
     Raster longer = MakeRaster(DataType::Type32R, std::vector<float>(61, -5.0f), 61, 1);
     ComplexInterpretation().InterpretRaster(&in, &longer, INTERPRETATION_REAL);
     EXPECT_EQ(Floats(longer), real);
-    Raster shorter(RasterInfo(2, 1, 1, DataType::Type32R), RasterContext());
-    ComplexInterpretation().InterpretRaster(&in, &shorter, INTERPRETATION_IMAGINARY);
-    EXPECT_EQ(Floats(shorter), std::vector<float>({0, -1}));
+}
+
+// Buffers that cannot hold the samples are reported before anything is written: an output
+// smaller than the input, an input without a buffer or with fewer bytes than its extent.
+TEST(ComplexInterpretation, RejectsBuffersThatDoNotHoldTheSamples) {
+    const Raster in = MakeRaster(DataType::TypeC16S, std::vector<short>(12), 3, 2);
+    Raster shorter = MakeRaster(DataType::Type32R, std::vector<float>(5, -5.0f), 5, 1);
+    Raster noBuffer;
+    noBuffer.width = noBuffer.height = noBuffer.channels = 1;
+    noBuffer.dataType = DataType::TypeC32R;
+    Raster shortBuffer = MakeRaster(DataType::TypeC16S, std::vector<short>(12), 3, 2);
+    shortBuffer.byteSize = 23;
+    const ComplexInterpretation interpretation;
+    const struct {
+        const Raster* in;
+        Raster* out;
+        const char* message;
+    } cases[] = {
+        {&in, &shorter, "The out raster buffer does not hold the input's samples."},
+        {&noBuffer, &shorter, "The raster buffer does not hold its samples."},
+        {&shortBuffer, &shorter, "The raster buffer does not hold its samples."},
+        {&noBuffer, nullptr, "The raster buffer does not hold its samples."},
+    };
+    for (const auto& c : cases) {
+        const auto failure = kubo_test::Catch<kora::DataException>([&] {
+            if (c.out != nullptr) {
+                interpretation.InterpretRaster(c.in, c.out, INTERPRETATION_REAL);
+            } else {
+                delete interpretation.InterpretRaster(c.in, INTERPRETATION_REAL);
+            }
+        });
+        ASSERT_TRUE(failure.has_value()) << c.message;
+        kubo_test::ExpectReport(*failure, c.message, kSource,
+                                c.out != nullptr ? kIntoSignature : kNewSignature, 0);
+    }
+    EXPECT_EQ(Floats(shorter), std::vector<float>(5, -5.0f));
 }
 
 TEST(ComplexInterpretation, CachesOneWorkerPerTypeAndCopiesShareIt) {

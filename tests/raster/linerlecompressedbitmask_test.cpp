@@ -198,4 +198,31 @@ TEST(LineRLECompressedBitMask, AStartPastTheRowsRunsIsNotFound) {
     }
 }
 
+// A raster whose buffer cannot give one byte per pixel of every visible row is refused
+// before anything is read: no channels or 0-bit samples (every row then starts at byte 0
+// of a 0-byte buffer), no buffer, or a byte size short of the last row.
+TEST(LineRLECompressedBitMask, RefusesRastersWhoseBufferDoesNotHoldTheRows) {
+    Raster noChannels(RasterInfo(4, 2, 0, DataType::Type8U), RasterContext());
+    Raster noBits(RasterInfo(4, 2, 1, DataType()), RasterContext(1, 1, 0, 0));
+    Raster noBuffer;
+    noBuffer.width = noBuffer.height = noBuffer.channels = 1;
+    noBuffer.dataType = DataType::Type8U;
+    Raster shortBuffer(RasterInfo(4, 2, 1, DataType::Type8U), RasterContext());
+    shortBuffer.byteSize = 7;
+    for (Raster* raster : {&noChannels, &noBits, &noBuffer, &shortBuffer}) {
+        const auto failure =
+            kubo_test::Catch<kora::DataException>([&] { LineRLECompressedBitMask mask(*raster); });
+        ASSERT_TRUE(failure.has_value());
+        kubo_test::ExpectReport(
+            *failure, "The raster buffer does not hold one byte per pixel of every row to compress",
+            kSource,
+            "__cdecl kora::kubo::LineRLECompressedBitMask::LineRLECompressedBitMask(class "
+            "kora::kubo::Raster &)",
+            0);
+    }
+    // An empty visible area reads nothing, whatever the buffer.
+    Raster empty(RasterInfo(0, 3, 0, DataType()), RasterContext());
+    EXPECT_EQ(LineRLECompressedBitMask(empty).GetCompressedRowSize(2), 1u);
+}
+
 }  // namespace

@@ -2,11 +2,14 @@
 
 #include <gtest/gtest.h>
 
+#include <climits>
 #include <cstring>
 #include <memory>
 #include <string>
 #include <utility>
+#include <vector>
 
+#include "support/expectfailure.h"
 #include "vrkframework/platform/rasterreader.h"
 
 namespace {
@@ -71,6 +74,41 @@ TEST(Raster, SizesIncludeMarginsAndRoundSampleBytesUp) {
         EXPECT_EQ(raster.xOffset + raster.yOffset, 300u);
         EXPECT_EQ(raster.dataType, c.type);
         raster.data[raster.byteSize - 1] = 0xff;  // the whole extent is writable
+    }
+}
+
+// Line stride and buffer height are 32-bit fields and the byte count a 64-bit one: an
+// extent beyond them (a negative margin cast to unsigned, most often) is refused before
+// anything is allocated, with the full extent in the message.
+TEST(Raster, RefusesExtentsItsFieldsCannotDescribe) {
+    const struct {
+        RasterInfo info;
+        RasterContext context;
+        const char* message;
+        std::vector<int> values;
+    } cases[] = {
+        {RasterInfo(10, 7, 1, DataType::Type8U),
+         RasterContext(static_cast<unsigned int>(-3), 0, 0, 0),
+         "A raster of 8589934596 x 7 pixels (margins included) exceeds 4294967295 pixels a side",
+         {INT_MAX, 7}},
+        {RasterInfo(10, 4294967295u, 1, DataType::Type8U),
+         RasterContext(0, 1, 0, 0),
+         "A raster of 10 x 4294967297 pixels (margins included) exceeds 4294967295 pixels a side",
+         {10, INT_MAX}},
+        {RasterInfo(4294967295u, 4294967295u, 4294967295u, DataType::TypeC64R),
+         RasterContext(),
+         "A raster of 4294967295 x 4294967295 pixels (margins included) exceeds 2^64 bytes",
+         {INT_MAX, INT_MAX}},
+    };
+    for (const auto& c : cases) {
+        const auto failure = kubo_test::Catch<kora::OutOfBoundsException>(
+            [&] { const Raster raster(c.info, c.context); });
+        ASSERT_TRUE(failure.has_value()) << c.message;
+        kubo_test::ExpectReport(*failure, c.message, "vrkframework/basic/kubo/raster/raster",
+                                "__cdecl kora::kubo::Raster::Raster(const class "
+                                "kora::kubo::RasterInfo &,const class kora::kubo::RasterContext &)",
+                                0);
+        EXPECT_EQ(failure->GetValues(), c.values);
     }
 }
 

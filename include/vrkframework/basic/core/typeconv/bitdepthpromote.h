@@ -2,63 +2,32 @@
 #ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_BITDEPTHPROMOTE_H
 #define VRKFRAMEWORK_BASIC_CORE_TYPECONV_BITDEPTHPROMOTE_H
 
-#include <cstdint>  // std::int64_t, std::uint64_t
-
-#include "vrkframework/basic/kubo/kuboapi.h"
+#include "vrkframework/basic/core/typeconv/packedoperations.h"
+#include "vrkframework/basic/core/typeconv/typelist.h"
 
 namespace typeconv {
 
 /// Static kernels between a packed stream of N-bit unsigned samples and samples of the
-/// integer type T. Only the layout <N, T, 0, 0> exists: sample i occupies stream bits
-/// N*i to N*i+N-1, most significant bit first, and stream bit k is bit 7 - k%8 of byte
-/// k/8; a stream of `count` samples takes (count * N + 7) / 8 bytes.
+/// integer type T (any type with the traits of an integer component type). Only the layout
+/// <N, T, 0, 0> exists; its stream layout and rules are those of
+/// detail::PackedOperations<N, T, S>.
 template <unsigned int N, class T, unsigned int BitOrder, unsigned int Extension>
 struct BitDepthPromote;
 
 template <unsigned int N, class T>
-struct KUBO_API BitDepthPromote<N, T, 0, 0> {
-    /// Unpacks `count` samples into `samples`, zero-extended whatever the sign of T (a
-    /// 12-bit 0xFFF gives 4095 in short). A count of 0, or one of 2^31 or more, converts
-    /// nothing.
-    /// @throws kora::Exception "Invalid type promote, the number of bit is bigger than the
-    /// type requested for conversion" (line 390) when N exceeds the bits of T, before
-    /// anything is written.
-    static void Promote(const unsigned char* packed, T* samples, unsigned int count);
-    /// Clears the (count * N + 7) / 8 bytes of the stream, then ORs the samples in. Values
-    /// are not clamped to N bits: a sample within one byte loses its bits above bit N-1,
-    /// but a sample spanning two or more bytes ORs its higher bits into the first byte it
-    /// touches, that is into the previous sample. A count of 0, or one of 2^31 or more,
-    /// writes nothing.
-    /// @throws kora::Exception as Promote, with line 395.
-    static void Pack(const T* samples, unsigned char* packed, unsigned int count);
+struct BitDepthPromote<N, T, 0, 0> {
+    /// Unpacks `count` samples into `samples`, zero-extended whatever the sign of T.
+    /// @throws kora::Exception (line 390) when N exceeds the bits of T.
+    static void Promote(const unsigned char* packed, T* samples, unsigned int count) {
+        detail::PackedOperations<N, priv::Component<T>, 0>().Promote(packed, samples, count);
+    }
+    /// Clears the (count * N + 7) / 8 bytes of the stream, then ORs the samples in.
+    /// @throws kora::Exception (line 395) when N exceeds the bits of T.
+    static void Pack(const T* samples, unsigned char* packed, unsigned int count) {
+        detail::PackedOperations<N, priv::Component<T>, 1>().Promote(samples, packed, count);
+    }
 };
 
-}  // namespace typeconv
-
-/// Applies X(N, T) to every packed bit count N and integer element type T of the
-/// bit-depth kernels.
-#define KUBO_FOR_EACH_PACKED_LAYOUT(X)               \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, char)           \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, unsigned char)  \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, short)          \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, unsigned short) \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, int)            \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, unsigned int)   \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, std::int64_t)   \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, std::uint64_t)
-
-// clang-format off
-#define KUBO_DETAIL_PACKED_BIT_COUNTS(X, T)                                                    \
-    X(1, T) X(2, T) X(3, T) X(4, T) X(5, T) X(6, T) X(7, T) X(9, T) X(10, T) X(11, T) X(12, T) \
-    X(13, T) X(14, T) X(15, T) X(17, T) X(18, T) X(19, T) X(20, T) X(21, T) X(22, T)         \
-    X(23, T) X(24, T) X(25, T) X(26, T) X(27, T) X(28, T) X(29, T) X(30, T) X(31, T)
-// clang-format on
-
-namespace typeconv {
-#define KUBO_DETAIL_EXTERN_BIT_DEPTH(N, T) \
-    extern template struct KUBO_API BitDepthPromote<N, T, 0, 0>;
-KUBO_FOR_EACH_PACKED_LAYOUT(KUBO_DETAIL_EXTERN_BIT_DEPTH)
-#undef KUBO_DETAIL_EXTERN_BIT_DEPTH
 }  // namespace typeconv
 
 #endif  // VRKFRAMEWORK_BASIC_CORE_TYPECONV_BITDEPTHPROMOTE_H

@@ -12,7 +12,8 @@ namespace typeconv {
 /// the rules of Promote<A, B>; the imaginary part is ignored (no magnitude is taken).
 template <class A, class B>
 class KUBO_API Complex2RealPromote
-    : public detail::PromoteOperations<A, B, detail::SampleLayout::kComplexToReal> {};
+    : public detail::PromoteOperations<priv::Component<A>, priv::Component<B>,
+                                       detail::SampleLayout::kComplexToReal> {};
 
 // Instantiated for every pair of component types inside the library.
 #define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                        \

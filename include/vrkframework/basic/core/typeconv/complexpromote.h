@@ -12,7 +12,8 @@ namespace typeconv {
 /// components of each sample, real part first, follow the rules of Promote<A, B>.
 template <class A, class B>
 class KUBO_API ComplexPromote
-    : public detail::PromoteOperations<A, B, detail::SampleLayout::kComplex> {};
+    : public detail::PromoteOperations<priv::Component<A>, priv::Component<B>,
+                                       detail::SampleLayout::kComplex> {};
 
 // Instantiated for every pair of component types inside the library.
 #define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                  \

@@ -2,8 +2,8 @@
 #ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_PACKEDPROMOTE_H
 #define VRKFRAMEWORK_BASIC_CORE_TYPECONV_PACKEDPROMOTE_H
 
-#include "vrkframework/basic/core/typeconv/bitdepthpromote.h"
-#include "vrkframework/basic/core/typeconv/ipromote.h"
+#include "vrkframework/basic/core/typeconv/packedoperations.h"
+#include "vrkframework/basic/core/typeconv/typelist.h"
 #include "vrkframework/basic/kubo/kuboapi.h"
 
 namespace typeconv {
@@ -14,14 +14,7 @@ namespace typeconv {
 /// kora::kubo::PromoteFactory, deleted through IPromote. When N exceeds the bits of T,
 /// Promote throws what the bit-depth kernel throws.
 template <unsigned int N, class T, unsigned int S>
-class KUBO_API SpecialPromote : public IPromote {
-public:
-    void Promote(const void* src, void* dst, unsigned int count) override;
-    /// N when unpacking, the bits of T when packing.
-    unsigned int GetInputBits() const override;
-    /// The bits of T when unpacking, N when packing.
-    unsigned int GetOutputBits() const override;
-};
+class KUBO_API SpecialPromote : public detail::PackedOperations<N, priv::Component<T>, S> {};
 
 #define KUBO_DETAIL_EXTERN_SPECIAL(N, T)                    \
     extern template class KUBO_API SpecialPromote<N, T, 0>; \

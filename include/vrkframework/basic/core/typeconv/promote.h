@@ -19,7 +19,8 @@ namespace typeconv {
 /// integers convert to the nearest floating value; double to float overflows to infinity.
 /// Create it with new (or through kora::kubo::PromoteFactory) and call it through IPromote.
 template <class A, class B>
-class KUBO_API Promote : public detail::PromoteOperations<A, B, detail::SampleLayout::kReal> {};
+class KUBO_API Promote : public detail::PromoteOperations<priv::Component<A>, priv::Component<B>,
+                                                          detail::SampleLayout::kReal> {};
 
 // Instantiated for every pair of component types inside the library.
 #define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                                          \

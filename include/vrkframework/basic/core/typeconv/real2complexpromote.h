@@ -12,7 +12,8 @@ namespace typeconv {
 /// the rules of Promote<A, B>, the imaginary part is 0.
 template <class A, class B>
 class KUBO_API Real2ComplexPromote
-    : public detail::PromoteOperations<A, B, detail::SampleLayout::kRealToComplex> {};
+    : public detail::PromoteOperations<priv::Component<A>, priv::Component<B>,
+                                       detail::SampleLayout::kRealToComplex> {};
 
 // Instantiated for every pair of component types inside the library.
 #define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                        \

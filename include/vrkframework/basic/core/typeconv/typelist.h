@@ -62,6 +62,35 @@ constexpr kora::kubo::DataType RealDescriptor() {
     }
 }
 
+/// The first type of the list with the size, signedness and floatness of T; NullDataType
+/// when none has them.
+template <class T, class List>
+struct FindComponent {
+    using type = NullDataType;
+};
+template <class T, class Head, class Tail>
+struct FindComponent<T, TypeList<Head, Tail>> {
+    using type =
+        std::conditional_t<sizeof(Head) == sizeof(T) &&
+                               std::is_signed_v<Head> == std::is_signed_v<T> &&
+                               std::is_floating_point_v<Head> == std::is_floating_point_v<T>,
+                           Head, typename FindComponent<T, Tail>::type>;
+};
+
+/// The component type a sample type T stands for: T itself for the ten component types;
+/// another arithmetic type of the same traits, such as `long long` where `std::int64_t` is
+/// `long`, maps to the component type that has them. The public conversion templates are
+/// written on it, so that they instantiate for every such type.
+template <class T>
+struct ComponentOf {
+    static_assert(std::is_arithmetic_v<T>, "samples are of an arithmetic type");
+    using type = typename FindComponent<T, ComponentTypes>::type;
+    static_assert(!std::is_same_v<type, NullDataType>,
+                  "no component type has the size, signedness and floatness of T");
+};
+template <class T>
+using Component = typename ComponentOf<T>::type;
+
 /// The complex descriptor whose components are of type T.
 template <class T>
 constexpr kora::kubo::DataType ComplexDescriptor() {

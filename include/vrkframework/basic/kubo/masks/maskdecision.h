@@ -47,8 +47,11 @@ public:
     /// Binds to the raster, then flags pixels first .. first + count - 1 of its full extent
     /// (row-major, margins included) into `flags`: a large raster can be worked through in
     /// cache-sized pieces with the same flags as a whole-raster pass. Pixels whose samples
-    /// would lie past the raster's buffer (a kernel reading more samples per pixel than the
-    /// raster has) are flagged background without being read.
+    /// would lie past the raster's buffer (no buffer, or a kernel reading more samples per
+    /// pixel than the raster has) are flagged background without being read. Under the pair
+    /// rule with an odd number of samples per pixel, a pixel's last sample pairs with the
+    /// first of the next pixel; the buffer's last pixel has none, and its half pair does
+    /// not match.
     void EvaluateRange(const Raster& raster, std::uint64_t first, std::size_t count,
                        unsigned char* flags);
     /// 1 when the pixel at `pixel` is valid under the current kernel, else 0.
@@ -67,6 +70,7 @@ private:
     std::unique_ptr<IMaskDecisionImpl> m_impl;
     RasterInfo m_bound;           // width, height, channels and type the kernel was made for
     std::uint64_t m_pixelStride;  // samples the kernel reads per pixel
+    bool m_reachesNextPixel;      // the kernel pairs the last sample with the next pixel's first
     BkgdRule m_rule;
     bool m_expanded;
     std::vector<double> m_noData;

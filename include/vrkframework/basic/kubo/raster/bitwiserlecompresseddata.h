@@ -46,7 +46,8 @@ public:
     /// The runs; valid as long as one copy of this object lives.
     const unsigned char* GetCompressedData() const { return m_buffer.get(); }
     /// Number of runs (bytes).
-    unsigned int GetCompressedSize() const { return static_cast<unsigned int>(m_size); }
+    /// @throws kora::OutOfBoundsException when the count exceeds 32 bits.
+    unsigned int GetCompressedSize() const;
 
     /// A new buffer of the whole raster's size holding the whole raster.
     unsigned char* Decode() const override;
@@ -69,19 +70,19 @@ public:
     void Decode(unsigned char* out) const override;
 
 private:
-    void Compress(unsigned char* buffer, unsigned long bitCount);
-    unsigned long GetLineSize() const;
-    unsigned long GetBufferSizeBytes() const;
+    void Compress(unsigned char* buffer, std::uint64_t bitCount);
+    std::uint64_t GetLineSize() const;
+    std::uint64_t GetBufferSizeBytes() const;
     void DecodeWindow(int x, int y, int w, int h, unsigned char* out, std::size_t capacity) const;
 
     // The read cursor.
     void ResetSeek() const;
     void Jump() const;
-    void Seek(unsigned long bit) const;
+    void Seek(std::uint64_t bit) const;
     void EnterUnreadRun() const;
     void ReadBit(unsigned char* dst, int k) const;
     void ReadByte(unsigned char* dst) const;
-    void Read(unsigned long byteOffset, unsigned long byteCount, unsigned char* dst) const;
+    void Read(std::uint64_t byteOffset, std::uint64_t byteCount, unsigned char* dst) const;
 
     std::shared_ptr<unsigned char> m_buffer;
     std::size_t m_size;

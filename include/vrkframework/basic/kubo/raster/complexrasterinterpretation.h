@@ -11,6 +11,23 @@
 #include "vrkframework/platform/interpretation.h"
 
 namespace kora::kubo {
+namespace detail {
+
+/// Implements the worker of the component type T (see ComplexInterpretation::InnerProcessor).
+template <class T>
+class KUBO_API ComplexProcessor : public IRasterInterpretation {
+public:
+    void InterpretRaster(const Raster* in, Raster* out,
+                         kora::core::KORAInterpretationTypes type) const override;
+    Raster* InterpretRaster(const Raster* in,
+                            kora::core::KORAInterpretationTypes type) const override;
+};
+
+#define KUBO_DETAIL_EXTERN_COMPLEX_PROCESSOR(T) extern template class KUBO_API ComplexProcessor<T>;
+KUBO_FOR_EACH_COMPONENT_TYPE(KUBO_DETAIL_EXTERN_COMPLEX_PROCESSOR)
+#undef KUBO_DETAIL_EXTERN_COMPLEX_PROCESSOR
+
+}  // namespace detail
 
 /// Applies an interpretation function f(real, imaginary) to every (real, imaginary) pair of
 /// a complex raster, margins included, and stores the results as 32-bit floats.
@@ -21,12 +38,13 @@ namespace kora::kubo {
 /// access.
 class KUBO_API ComplexInterpretation : public IRasterInterpretation {
 public:
-    /// The worker for one component type T of the dispatch list: reads each component as T
-    /// (sign extension for signed integers, zero extension for unsigned ones, widening for
-    /// float) and converts it to double. It raises nothing of its own (a null raster is left
-    /// alone, and the new-raster overload returns null for it); ComplexInterpretation
-    /// checks. Reads and writes stay within the buffers the rasters own; for a wrapped
-    /// buffer the caller guarantees its extent.
+    /// The worker for one component type T of the dispatch list (or any type with its
+    /// traits): reads each component as T (sign extension for signed integers, zero
+    /// extension for unsigned ones, widening for float) and converts it to double. A null
+    /// raster is left alone (the new-raster overload returns null for it);
+    /// ComplexInterpretation checks the rest.
+    /// @throws kora::DataException when the input's buffer (none, or fewer bytes than its
+    ///   extent) or the output's does not hold the input's samples, before writing.
     template <class T>
     class InnerProcessor;
 
@@ -47,6 +65,8 @@ public:
     ///   "This out raster is NULL.", "The out raster must be 32R.", "This raster
     ///   interpretation class can only interpret complex rasters."; the dispatcher's failure
     ///   for a complex type it does not know; FindInterpretation's for an unknown code.
+    ///   kora::DataException when `in`'s buffer does not hold its extent (no buffer, or fewer
+    ///   bytes than its description needs) or `out`'s does not hold as many samples.
     ///   Nothing is written to `out` when it throws.
     void InterpretRaster(const Raster* in, Raster* out,
                          kora::core::KORAInterpretationTypes type) const override;
@@ -68,13 +88,8 @@ private:
 };
 
 template <class T>
-class ComplexInterpretation::InnerProcessor : public IRasterInterpretation {
-public:
-    void InterpretRaster(const Raster* in, Raster* out,
-                         kora::core::KORAInterpretationTypes type) const override;
-    Raster* InterpretRaster(const Raster* in,
-                            kora::core::KORAInterpretationTypes type) const override;
-};
+class KUBO_API ComplexInterpretation::InnerProcessor
+    : public detail::ComplexProcessor<typeconv::priv::Component<T>> {};
 
 #define KUBO_DETAIL_EXTERN_INNER_PROCESSOR(T) \
     extern template class KUBO_API ComplexInterpretation::InnerProcessor<T>;

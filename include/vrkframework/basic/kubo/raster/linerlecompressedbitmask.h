@@ -43,11 +43,11 @@ public:
     unsigned int GetChansCount() const { return m_info.channels; }
     const DataType& GetDataType() const { return m_info.dataType; }
     /// (bits + 7) / 8 of the 1-bit type: 1.
-    unsigned long GetBytesPerPixel() const;
+    std::uint64_t GetBytesPerPixel() const;
     /// Bytes of one decoded row: bytes-per-pixel x channels x width.
-    unsigned long GetRowSize() const;
+    std::uint64_t GetRowSize() const;
     /// Bytes of the decoded mask: bytes-per-pixel x channels x height x width.
-    unsigned long GetBufferSize() const;
+    std::uint64_t GetBufferSize() const;
     /// The runs of `row` (null while the row is empty); valid until the row is replaced
     /// and as long as one copy of this object lives.
     const unsigned char* GetCompressedRow(unsigned long row) const;
@@ -80,11 +80,11 @@ public:
 private:
     struct RowTable;
 
-    static std::unique_ptr<unsigned char[]> Compress(unsigned char* data, unsigned long count,
-                                                     unsigned long& size);
-    void DecodePartialRow(unsigned long row, unsigned long start, unsigned long count,
+    static std::unique_ptr<unsigned char[]> Compress(unsigned char* data, std::uint64_t count,
+                                                     std::uint64_t& size);
+    void DecodePartialRow(unsigned long row, std::uint64_t start, std::uint64_t count,
                           unsigned char* out) const;
-    void DecodeWindow(int x, int y, int w, int h, unsigned char* out, unsigned long capacity) const;
+    void DecodeWindow(int x, int y, int w, int h, unsigned char* out, std::uint64_t capacity) const;
 
     std::shared_ptr<RowTable> m_rows;
     RasterInfo m_info;

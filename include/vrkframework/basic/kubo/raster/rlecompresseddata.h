@@ -46,7 +46,8 @@ public:
     /// The pairs; valid as long as one copy of this object lives.
     const unsigned char* GetCompressedData() const { return m_buffer.get(); }
     /// Bytes of pairs (always even).
-    unsigned int GetCompressedSize() const { return static_cast<unsigned int>(m_size); }
+    /// @throws kora::OutOfBoundsException when the count exceeds 32 bits.
+    unsigned int GetCompressedSize() const;
 
     /// A new buffer of width x height x channels x bytes-per-sample bytes holding the
     /// whole raster.

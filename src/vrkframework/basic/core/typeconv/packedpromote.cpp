@@ -1,13 +1,14 @@
-// The bit-depth kernels and packed converters of every bit count and integer type.
+// The packed converters of every bit count and integer type.
 #include "vrkframework/basic/core/typeconv/packedpromote.h"
 
 #include "vrkframework/basic/core/typeconv/packedpromote_impl.h"
 
 namespace typeconv {
 
-#define KUBO_DETAIL_INSTANTIATE_PACKED(N, T)     \
-    template struct BitDepthPromote<N, T, 0, 0>; \
-    template class SpecialPromote<N, T, 0>;      \
+#define KUBO_DETAIL_INSTANTIATE_PACKED(N, T)          \
+    template class detail::PackedOperations<N, T, 0>; \
+    template class detail::PackedOperations<N, T, 1>; \
+    template class SpecialPromote<N, T, 0>;           \
     template class SpecialPromote<N, T, 1>;
 KUBO_FOR_EACH_PACKED_LAYOUT(KUBO_DETAIL_INSTANTIATE_PACKED)
 #undef KUBO_DETAIL_INSTANTIATE_PACKED

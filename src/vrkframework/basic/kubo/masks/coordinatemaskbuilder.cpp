@@ -6,6 +6,7 @@
 #include <cstdint>    // std::int64_t
 
 #include "vrkframework/basic/kubo/masks/mask.h"
+#include "vrkframework/basic/kubo/masks/maskextent.h"
 #include "vrkframework/basic/kubo/raster/raster.h"
 
 namespace kora::kubo {
@@ -21,6 +22,9 @@ void CoordinateMaskBuilder::AddValidCoordinate(int row, int column) {
 }
 
 Mask* CoordinateMaskBuilder::BuildMask(const Raster& raster) const {
+    detail::CheckMaskExtent(raster, raster, "vrkframework/basic/kubo/masks/coordinatemaskbuilder",
+                            "class kora::kubo::Mask *__cdecl kora::kubo::CoordinateMaskBuilder::"
+                            "BuildMask(const class kora::kubo::Raster &) const");
     auto* mask = new Mask(raster, raster);
     // Offsets and sizes are compared as signed 32-bit values; the sums are formed in 64 bits
     // so that an image reaching the end of the int range cannot overflow them.

@@ -1,34 +1,48 @@
 // Mask sizes and the packing of flag buffers into masks.
 #include "vrkframework/basic/kubo/masks/mask.h"
 
+#include <climits>  // INT_MAX, UINT_MAX
 #include <cstdint>  // std::uint64_t
 #include <cstring>  // std::memcpy
+#include <string>   // std::to_string
 
 #include "vrkframework/basic/kubo/masks/flagpacking.h"
+#include "vrkframework/basic/kubo/masks/maskextent.h"
+#include "vrkframework/basic/kubo/raster/bufferextent.h"
+#include "vrkframework/platform/exception.h"
 
 namespace kora::kubo {
-namespace {
+namespace detail {
 
-// The 32-bit sizes of a mask are kept as they have always been formed, wrapping for extents
-// beyond them; only the byte count is rounded in 64 bits, so that it cannot wrap to fewer
-// bytes than the bit count needs.
-int FullExtent(unsigned int size, unsigned int margin) {
-    return static_cast<int>(size + 2 * margin);
+void CheckMaskExtent(const RasterInfo& info, const RasterContext& context, const char* sourcePath,
+                     const char* function) {
+    const std::uint64_t fullWidth = FullExtent(info.width, context.xMargin);
+    const std::uint64_t fullHeight = FullExtent(info.height, context.yMargin);
+    if (fullWidth > INT_MAX || fullHeight > INT_MAX || fullWidth * fullHeight > UINT_MAX) {
+        throw kora::OutOfBoundsException(
+            {SaturatedInt(fullWidth), SaturatedInt(fullHeight)},
+            "A mask of " + std::to_string(fullWidth) + " x " + std::to_string(fullHeight) +
+                " pixels (margins included) exceeds the 4294967295 bits a mask holds",
+            sourcePath, function, 0);
+    }
 }
 
-unsigned int ByteCount(unsigned int bitCount) {
-    return static_cast<unsigned int>((std::uint64_t{bitCount} + 7) / 8);
-}
-
-}  // namespace
+}  // namespace detail
 
 Mask::Mask(const RasterInfo& info, const RasterContext& context)
     : RasterInfo(info.width, info.height, 1, DataType::Type1U),
       RasterContext(context),
-      m_fullWidth(FullExtent(info.width, context.xMargin)),
-      m_fullHeight(FullExtent(info.height, context.yMargin)),
-      m_bitCount(static_cast<unsigned int>(m_fullWidth) * static_cast<unsigned int>(m_fullHeight)),
-      m_byteCount(ByteCount(m_bitCount)) {
+      m_fullWidth(0),
+      m_fullHeight(0),
+      m_bitCount(0),
+      m_byteCount(0) {
+    detail::CheckMaskExtent(info, context, "vrkframework/basic/kubo/masks/mask",
+                            "__cdecl kora::kubo::Mask::Mask(const class kora::kubo::RasterInfo "
+                            "&,const class kora::kubo::RasterContext &)");
+    m_fullWidth = static_cast<int>(info.width + 2 * context.xMargin);
+    m_fullHeight = static_cast<int>(info.height + 2 * context.yMargin);
+    m_bitCount = static_cast<unsigned int>(m_fullWidth) * static_cast<unsigned int>(m_fullHeight);
+    m_byteCount = static_cast<unsigned int>((std::uint64_t{m_bitCount} + 7) / 8);
     m_bits.assign(m_byteCount, 0);
 }
 

@@ -2,37 +2,26 @@
 #include "vrkframework/basic/kubo/masks/maskdecision.h"
 
 #include <algorithm>  // std::min
-#include <cstring>    // std::memset
-#include <limits>
-#include <numeric>  // std::iota
-#include <utility>  // std::move
+#include <cstring>    // std::memcpy, std::memset
+#include <numeric>    // std::iota
+#include <utility>    // std::move
+#include <vector>
 
 #include "vrkframework/basic/kubo/masks/nodatarequest.h"
+#include "vrkframework/basic/kubo/raster/bufferextent.h"
 #include "vrkframework/basic/kubo/raster/raster.h"
 
 namespace kora::kubo {
 namespace {
 
-constexpr std::uint64_t kUnbounded = std::numeric_limits<std::uint64_t>::max();
-
-std::uint64_t SaturatingProduct(std::uint64_t a, std::uint64_t b) {
-    return a != 0 && b > kUnbounded / a ? kUnbounded : a * b;
-}
-
-// Pixels of `stride` samples that the raster's buffer holds; a kernel that reads nothing
-// can flag any number of them.
-std::uint64_t ReadablePixels(const Raster& raster, std::uint64_t stride) {
+// Pixels of `stride` samples of `sampleBytes` each that the raster's buffer holds; a
+// kernel that reads nothing can flag any number of them.
+std::uint64_t ReadablePixels(const Raster& raster, std::uint64_t stride,
+                             std::uint64_t sampleBytes) {
     if (stride == 0) {
-        return kUnbounded;
+        return detail::kUnbounded;
     }
-    if (raster.data == nullptr) {
-        return 0;
-    }
-    const std::uint64_t pixels =
-        SaturatingProduct(raster.width + 2 * raster.xMargin, raster.height + 2 * raster.yMargin);
-    const std::uint64_t samplesPerPixel =
-        std::uint64_t{raster.channels} * (raster.dataType.isComplex ? 2 : 1);
-    return SaturatingProduct(pixels, samplesPerPixel) / stride;
+    return sampleBytes == 0 ? 0 : detail::BufferBytes(raster) / sampleBytes / stride;
 }
 
 void FlagBackground(unsigned char* flags, std::size_t count) {
@@ -46,6 +35,7 @@ void FlagBackground(unsigned char* flags, std::size_t count) {
 MaskDecision::MaskDecision(BkgdRule rule, std::vector<double> noData,
                            std::vector<unsigned int> channels, bool expanded)
     : m_pixelStride(0),
+      m_reachesNextPixel(false),
       m_rule(rule),
       m_expanded(expanded),
       m_noData(std::move(noData)),
@@ -56,6 +46,7 @@ MaskDecision::MaskDecision(const MaskDecision& other)
       m_impl(other.m_impl ? other.m_impl->Clone() : nullptr),
       m_bound(other.m_bound),
       m_pixelStride(other.m_pixelStride),
+      m_reachesNextPixel(other.m_reachesNextPixel),
       m_rule(other.m_rule),
       m_expanded(other.m_expanded),
       m_noData(other.m_noData),
@@ -91,6 +82,7 @@ void MaskDecision::Update(const RasterInfo& info) {
     const detail::NoDataRequest request =
         detail::MakeNoDataRequest(m_bound.dataType, m_bound.channels, m_rule, m_noData, m_channels);
     m_pixelStride = request.Stride();
+    m_reachesNextPixel = request.ReachesNextPixel();
     m_impl.reset(detail::MakeMaskDecisionImpl(request));
 }
 
@@ -103,9 +95,7 @@ void MaskDecision::Evaluate(const void* samples, unsigned char* flags, std::size
 }
 
 void MaskDecision::Evaluate(const Raster& raster, unsigned char* flags) {
-    const std::uint64_t pixels = std::uint64_t{raster.width + 2 * raster.xMargin} *
-                                 std::uint64_t{raster.height + 2 * raster.yMargin};
-    EvaluateRange(raster, 0, static_cast<std::size_t>(pixels), flags);
+    EvaluateRange(raster, 0, static_cast<std::size_t>(detail::BufferPixels(raster, raster)), flags);
 }
 
 void MaskDecision::EvaluateRange(const Raster& raster, std::uint64_t first, std::size_t count,
@@ -113,16 +103,28 @@ void MaskDecision::EvaluateRange(const Raster& raster, std::uint64_t first, std:
     Update(raster);
     std::size_t evaluated = 0;
     if (m_impl) {
-        const std::uint64_t readable = ReadablePixels(raster, m_pixelStride);
+        // Kernels exist for whole-byte components only.
+        const std::uint64_t sampleBytes = m_bound.dataType.bits / 8;
+        const std::uint64_t readable = ReadablePixels(raster, m_pixelStride, sampleBytes);
         evaluated = first < readable
                         ? static_cast<std::size_t>(std::min<std::uint64_t>(count, readable - first))
                         : 0;
         if (evaluated != 0) {
-            const std::uint64_t sampleBytes = m_bound.dataType.bits / 8;
-            const unsigned char* start = raster.data == nullptr
-                                             ? nullptr
-                                             : raster.data + first * m_pixelStride * sampleBytes;
+            const std::uint64_t pixelBytes = m_pixelStride * sampleBytes;
+            const unsigned char* start =
+                raster.data == nullptr ? nullptr : raster.data + first * pixelBytes;
             m_impl->Evaluate(start, flags, evaluated);
+            if (m_reachesNextPixel && first + evaluated < readable) {
+                // The kernel took the range's last pixel for the buffer's last; its half pair
+                // has a partner, the first sample of the pixel after the range.
+                const auto bytes = static_cast<std::size_t>(pixelBytes);
+                std::vector<unsigned char> twoPixels(2 * bytes);
+                std::memcpy(twoPixels.data(), start + (evaluated - 1) * bytes,
+                            bytes + static_cast<std::size_t>(sampleBytes));
+                unsigned char twoFlags[2];
+                m_impl->Evaluate(twoPixels.data(), twoFlags, 2);
+                flags[evaluated - 1] = twoFlags[0];
+            }
         }
     }
     FlagBackground(flags + evaluated, count - evaluated);

@@ -6,11 +6,14 @@
 #include <cstring>    // std::memset
 #include <memory>     // std::unique_ptr, std::make_shared
 #include <new>        // std::bad_alloc
+#include <typeinfo>   // typeid
 #include <utility>    // std::move
 
 #include "vrkframework/basic/kubo/masks/flagpacking.h"
 #include "vrkframework/basic/kubo/masks/mask.h"
 #include "vrkframework/basic/kubo/masks/maskdecision.h"
+#include "vrkframework/basic/kubo/masks/maskextent.h"
+#include "vrkframework/basic/kubo/raster/bufferextent.h"
 #include "vrkframework/basic/kubo/raster/raster.h"
 
 namespace kora::kubo {
@@ -37,8 +40,7 @@ std::vector<unsigned int> ChannelsUpTo(std::size_t count) {
 // The decision's flags for the whole extent, then packed: for decisions of other kinds,
 // whose Evaluate may look at the raster as a whole.
 Mask* BuildFromFlags(IMaskDecision* decision, const Raster& raster) {
-    const std::uint64_t pixels = std::uint64_t{raster.width + 2 * raster.xMargin} *
-                                 std::uint64_t{raster.height + 2 * raster.yMargin};
+    const std::uint64_t pixels = detail::BufferPixels(raster, raster);
     std::unique_ptr<unsigned char[]> flags(new unsigned char[pixels]);
     if (decision != nullptr) {
         decision->Evaluate(raster, flags.get());
@@ -96,9 +98,14 @@ MaskDecisionBuilder::MaskDecisionBuilder(const IMaskDecision* decision)
 MaskDecisionBuilder::~MaskDecisionBuilder() = default;
 
 Mask* MaskDecisionBuilder::BuildMask(const Raster& raster) const {
+    detail::CheckMaskExtent(raster, raster, "vrkframework/basic/kubo/masks/maskdecisionbuilder",
+                            "class kora::kubo::Mask *__cdecl kora::kubo::MaskDecisionBuilder::"
+                            "BuildMask(const class kora::kubo::Raster &) const");
     try {
-        if (auto* own = dynamic_cast<MaskDecision*>(m_decision.get())) {
-            return BuildInPieces(*own, raster);
+        // Only the library's own decision is evaluated piece by piece; a class derived from
+        // it may override Evaluate, which must then be called.
+        if (m_decision != nullptr && typeid(*m_decision) == typeid(MaskDecision)) {
+            return BuildInPieces(static_cast<MaskDecision&>(*m_decision), raster);
         }
         return BuildFromFlags(m_decision.get(), raster);
     } catch (const std::bad_alloc&) {

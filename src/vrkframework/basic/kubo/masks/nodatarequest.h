@@ -26,6 +26,11 @@ struct NoDataRequest {
 
     /// Samples the kernel reads per pixel.
     std::uint64_t Stride() const;
+    /// Whether the kernel pairs a pixel's last sample with the next pixel's first: the pair
+    /// rule over an odd stride.
+    bool ReachesNextPixel() const {
+        return !nothingTested && !single && rule == BkgdChanPairs && Stride() % 2 == 1;
+    }
 };
 
 /// Spreads complex samples over (real, imaginary) channel pairs with 0 as imaginary no-data

@@ -11,11 +11,15 @@
 
 namespace kora::kubo::detail {
 
-// The three rules, each as a scan that stops at the first decisive channel. A pixel of an
-// odd stride leaves its last sample without a partner: that half pair decides nothing, so
-// no pixel is judged by samples outside it.
+// The pair rule pairs samples k and k + 1 for every even k below the stride, so an odd
+// stride pairs its last sample with the first sample of the next pixel, tested as that
+// pixel's first channel. The last pixel a kernel is given has no next one: its half pair
+// counts as not matching, so nothing outside the given pixels is read.
+
+// The three rules, each as a scan that stops at the first decisive channel.
 template <BkgdRule Rule, class T, class TestAt>
-KUBO_INTERNAL unsigned char ScanPixel(const T* pixel, std::size_t stride, const TestAt& testAt) {
+KUBO_INTERNAL unsigned char ScanPixel(const T* pixel, std::size_t stride, const TestAt& testAt,
+                                      bool hasNext) {
     if constexpr (Rule == BkgdAllChans) {
         for (std::size_t k = 0; k < stride; ++k) {
             const auto test = testAt(k);
@@ -32,8 +36,10 @@ KUBO_INTERNAL unsigned char ScanPixel(const T* pixel, std::size_t stride, const 
         }
         return 1;
     } else {
-        for (std::size_t k = 0; k + 1 < stride; k += 2) {
-            if (testAt(k).Matches(pixel[k]) && testAt(k + 1).Matches(pixel[k + 1])) {
+        for (std::size_t k = 0; k < stride; k += 2) {
+            const bool partner = k + 1 < stride ? testAt(k + 1).Matches(pixel[k + 1])
+                                                : hasNext && testAt(0).Matches(pixel[stride]);
+            if (partner && testAt(k).Matches(pixel[k])) {
                 return 0;
             }
         }
@@ -43,30 +49,45 @@ KUBO_INTERNAL unsigned char ScanPixel(const T* pixel, std::size_t stride, const 
 
 // The same rules for a stride known at compile time, without branches, so the loop over
 // pixels vectorises; as the tests have no side effects, the flags equal those of the scan.
+template <BkgdRule Rule, std::size_t C, bool kHasNext, class T, class Test>
+KUBO_INTERNAL inline unsigned char FixedPixelFlag(const T* pixel,
+                                                  const std::array<Test, C>& tests) {
+    bool valid = Rule != BkgdAllChans;
+    if constexpr (Rule == BkgdAllChans) {
+        for (std::size_t k = 0; k < C; ++k) {
+            const bool differs = !tests[k].Matches(pixel[k]);
+            valid |= tests[k].IsTested() & differs;
+        }
+    } else if constexpr (Rule == BkgdAnyChan) {
+        for (std::size_t k = 0; k < C; ++k) {
+            valid &= !tests[k].Matches(pixel[k]);
+        }
+    } else {
+        for (std::size_t k = 0; k + 1 < C; k += 2) {
+            const bool first = tests[k].Matches(pixel[k]);
+            const bool second = tests[k + 1].Matches(pixel[k + 1]);
+            valid &= !(first & second);
+        }
+        if constexpr (C % 2 == 1 && kHasNext) {
+            const bool first = tests[C - 1].Matches(pixel[C - 1]);
+            const bool second = tests[0].Matches(pixel[C]);
+            valid &= !(first & second);
+        }
+    }
+    return valid;
+}
+
 template <BkgdRule Rule, std::size_t C, class T, class Test>
 KUBO_CLONED_TEMPLATE void FlagFixedStride(const T* __restrict samples,
                                           unsigned char* __restrict flags, std::size_t count,
                                           const std::array<Test, C> tests) {
-    for (std::size_t i = 0; i < count; ++i) {
-        const T* pixel = samples + i * C;
-        bool valid = Rule != BkgdAllChans;
-        if constexpr (Rule == BkgdAllChans) {
-            for (std::size_t k = 0; k < C; ++k) {
-                const bool differs = !tests[k].Matches(pixel[k]);
-                valid |= tests[k].IsTested() & differs;
-            }
-        } else if constexpr (Rule == BkgdAnyChan) {
-            for (std::size_t k = 0; k < C; ++k) {
-                valid &= !tests[k].Matches(pixel[k]);
-            }
-        } else {
-            for (std::size_t k = 0; k + 1 < C; k += 2) {
-                const bool first = tests[k].Matches(pixel[k]);
-                const bool second = tests[k + 1].Matches(pixel[k + 1]);
-                valid &= !(first & second);
-            }
-        }
-        flags[i] = valid;
+    constexpr bool kReachesNext = Rule == BkgdChanPairs && C % 2 == 1;
+    const std::size_t followed = kReachesNext && count != 0 ? count - 1 : count;
+    for (std::size_t i = 0; i < followed; ++i) {
+        flags[i] = FixedPixelFlag<Rule, C, true>(samples + i * C, tests);
+    }
+    if (followed != count) {
+        flags[followed] = FixedPixelFlag<Rule, C, false>(samples + followed * C, tests);
     }
 }
 
@@ -96,7 +117,7 @@ KUBO_INTERNAL void FlagPixels(const T* samples, unsigned char* flags, std::size_
             return FlagFixedStride<Rule>(samples, flags, count, TestsOf<4>(testAt));
         default:
             for (std::size_t i = 0; i < count; ++i) {
-                flags[i] = ScanPixel<Rule>(samples + i * stride, stride, testAt);
+                flags[i] = ScanPixel<Rule>(samples + i * stride, stride, testAt, i + 1 < count);
             }
     }
 }

@@ -8,6 +8,7 @@
 
 #include "vrkframework/basic/kubo/raster/alternatingruns.h"
 #include "vrkframework/basic/kubo/raster/bytesink.h"
+#include "vrkframework/basic/kubo/raster/count32.h"
 #include "vrkframework/basic/kubo/raster/decodedbytes.h"
 #include "vrkframework/basic/kubo/raster/wordscan.h"
 #include "vrkframework/platform/exception.h"
@@ -98,7 +99,13 @@ BitwiseRLECompressedData& BitwiseRLECompressedData::operator=(
 }
 BitwiseRLECompressedData::~BitwiseRLECompressedData() = default;
 
-void BitwiseRLECompressedData::Compress(unsigned char* buffer, unsigned long bitCount) {
+unsigned int BitwiseRLECompressedData::GetCompressedSize() const {
+    return detail::Count32(
+        m_size, "A compressed size", kSourcePath,
+        "unsigned int __cdecl kora::kubo::BitwiseRLECompressedData::GetCompressedSize(void) const");
+}
+
+void BitwiseRLECompressedData::Compress(unsigned char* buffer, std::uint64_t bitCount) {
     // Sized for smooth data at first; noise grows it.
     detail::ByteSink sink(bitCount / 128 + 16);
     detail::AppendAlternatingRuns(
@@ -111,12 +118,12 @@ void BitwiseRLECompressedData::Compress(unsigned char* buffer, unsigned long bit
     m_buffer = sink.Release();
 }
 
-unsigned long BitwiseRLECompressedData::GetLineSize() const {
-    return static_cast<unsigned long>((m_info.dataType.bits + 7u) / 8u) * m_info.channels *
+std::uint64_t BitwiseRLECompressedData::GetLineSize() const {
+    return static_cast<std::uint64_t>((m_info.dataType.bits + 7u) / 8u) * m_info.channels *
            m_info.width;
 }
 
-unsigned long BitwiseRLECompressedData::GetBufferSizeBytes() const {
+std::uint64_t BitwiseRLECompressedData::GetBufferSizeBytes() const {
     return GetLineSize() * m_info.height;
 }
 
@@ -172,8 +179,8 @@ void BitwiseRLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned
     std::size_t o = 0;
     for (long long row = y; row < static_cast<long long>(y) + h && o < capacity;
          ++row, o += spacing) {
-        Read(static_cast<unsigned long>(row) * GetLineSize() + static_cast<unsigned long>(x),
-             static_cast<unsigned long>(std::min(rowBytes, capacity - o)), out + o);
+        Read(static_cast<std::uint64_t>(row) * GetLineSize() + static_cast<std::uint64_t>(x),
+             static_cast<std::uint64_t>(std::min(rowBytes, capacity - o)), out + o);
     }
 }
 
@@ -198,7 +205,7 @@ inline void BitwiseRLECompressedData::Jump() const {
     m_bitValue = !m_bitValue;
 }
 
-inline void BitwiseRLECompressedData::Seek(unsigned long bit) const {
+inline void BitwiseRLECompressedData::Seek(std::uint64_t bit) const {
     if (bit < m_position) {
         ResetSeek();
     }
@@ -263,15 +270,15 @@ inline void BitwiseRLECompressedData::ReadByte(unsigned char* dst) const {
     *dst = byte;
 }
 
-inline void BitwiseRLECompressedData::Read(unsigned long byteOffset, unsigned long byteCount,
+inline void BitwiseRLECompressedData::Read(std::uint64_t byteOffset, std::uint64_t byteCount,
                                            unsigned char* dst) const {
     Seek(byteOffset * 8);
     // Reads stay byte-aligned: whole bytes inside one run go out as a fill, a byte that
     // straddles runs bit by bit.
-    for (unsigned long i = 0; i < byteCount;) {
+    for (std::uint64_t i = 0; i < byteCount;) {
         EnterUnreadRun();
-        const unsigned long whole =
-            std::min<unsigned long>((m_runLength - m_consumed) / 8, byteCount - i);
+        const std::uint64_t whole =
+            std::min<std::uint64_t>((m_runLength - m_consumed) / 8, byteCount - i);
         if (whole == 0) {
             ReadByte(dst + i);
             ++i;

@@ -2,13 +2,12 @@
 // per-sample loop every component type shares.
 #include "vrkframework/basic/kubo/raster/complexrasterinterpretation.h"
 
-#include <algorithm>  // std::min
-#include <cstdint>    // std::uint64_t
-#include <cstring>    // std::memcpy
-#include <limits>
+#include <cstdint>  // std::uint64_t
+#include <cstring>  // std::memcpy
 #include <utility>  // std::move
 
 #include "vrkframework/basic/core/typedispatch/extendtypedispatch.h"
+#include "vrkframework/basic/kubo/raster/bufferextent.h"
 #include "vrkframework/basic/kubo/raster/raster.h"
 #include "vrkframework/platform/exception.h"
 
@@ -38,23 +37,25 @@ using Dispatcher = kora::typedispatch::ExtendDispatchTypes<
 
 // Samples of the whole buffer, margins included.
 std::uint64_t SampleCount(const Raster& raster) {
-    return (std::uint64_t{raster.height} + 2u * std::uint64_t{raster.yMargin}) *
-           (std::uint64_t{raster.width} + 2u * std::uint64_t{raster.xMargin}) * raster.channels;
+    return detail::SaturatingProduct(detail::BufferPixels(raster, raster), raster.channels);
 }
 
-// Samples of `sampleBytes` the buffer can take. An owned buffer's size is known from its
-// allocation, so a too small output or a mislabelled input is never overrun; a wrapped
-// buffer's extent is its owner's word.
-std::uint64_t Capacity(const Raster& raster, std::size_t sampleBytes) {
-    return raster.ownsData ? raster.byteSize / sampleBytes
-                           : std::numeric_limits<std::uint64_t>::max();
-}
-
+// Converts every sample of `in` into the 32-bit floats of `out`, after checking that both
+// buffers hold them: a raster without a buffer or with fewer bytes than its extent, or an
+// output too small, is reported before anything is written.
 template <class T>
-void Interpret(InterpretationFunction function, const Raster& in, Raster& out) {
+void Interpret(InterpretationFunction function, const Raster& in, Raster& out,
+               const char* signature) {
     constexpr std::size_t kPairBytes = 2 * sizeof(T);
-    const std::uint64_t count =
-        std::min({SampleCount(in), Capacity(in, kPairBytes), Capacity(out, sizeof(float))});
+    const std::uint64_t count = SampleCount(in);
+    if (detail::BufferBytes(in) / kPairBytes < count) {
+        throw kora::DataException("The raster buffer does not hold its samples.", kSourcePath,
+                                  signature, 0);
+    }
+    if (detail::BufferBytes(out) / sizeof(float) < count) {
+        throw kora::DataException("The out raster buffer does not hold the input's samples.",
+                                  kSourcePath, signature, 0);
+    }
     const unsigned char* source = in.data;
     unsigned char* target = out.data;
     // memcpy reads and writes whatever the buffer's alignment; each compiles to one move.
@@ -124,17 +125,17 @@ const IRasterInterpretation& ComplexInterpretation::Processor(const DataType& ty
 }
 
 template <class T>
-void ComplexInterpretation::InnerProcessor<T>::InterpretRaster(const Raster* in, Raster* out,
-                                                               KORAInterpretationTypes type) const {
+void detail::ComplexProcessor<T>::InterpretRaster(const Raster* in, Raster* out,
+                                                  KORAInterpretationTypes type) const {
     const InterpretationFunction function = kora::core::FindInterpretation(type);
     if (in != nullptr && out != nullptr) {
-        Interpret<T>(function, *in, *out);
+        Interpret<T>(function, *in, *out, kIntoSignature);
     }
 }
 
 template <class T>
-Raster* ComplexInterpretation::InnerProcessor<T>::InterpretRaster(
-    const Raster* in, KORAInterpretationTypes type) const {
+Raster* detail::ComplexProcessor<T>::InterpretRaster(const Raster* in,
+                                                     KORAInterpretationTypes type) const {
     // The function is looked up before the allocation, so an unknown code leaks nothing.
     const InterpretationFunction function = kora::core::FindInterpretation(type);
     if (in == nullptr) {
@@ -143,11 +144,12 @@ Raster* ComplexInterpretation::InnerProcessor<T>::InterpretRaster(
     auto out =
         std::make_unique<Raster>(RasterInfo(in->width, in->height, in->channels, DataType::Type32R),
                                  static_cast<const RasterContext&>(*in));
-    Interpret<T>(function, *in, *out);
+    Interpret<T>(function, *in, *out, kNewSignature);
     return out.release();
 }
 
 #define KUBO_DETAIL_INSTANTIATE_INNER_PROCESSOR(T) \
+    template class detail::ComplexProcessor<T>;    \
     template class ComplexInterpretation::InnerProcessor<T>;
 KUBO_FOR_EACH_COMPONENT_TYPE(KUBO_DETAIL_INSTANTIATE_INNER_PROCESSOR)
 #undef KUBO_DETAIL_INSTANTIATE_INNER_PROCESSOR

@@ -10,7 +10,9 @@
 #include <vector>
 
 #include "vrkframework/basic/kubo/raster/alternatingruns.h"
+#include "vrkframework/basic/kubo/raster/bufferextent.h"
 #include "vrkframework/basic/kubo/raster/bytesink.h"
+#include "vrkframework/basic/kubo/raster/count32.h"
 #include "vrkframework/basic/kubo/raster/decodedbytes.h"
 #include "vrkframework/basic/kubo/raster/wordscan.h"
 #include "vrkframework/platform/exception.h"
@@ -63,8 +65,8 @@ inline RunEnd FindPixel(const unsigned char* runs, std::size_t runCount, std::ui
 
 // Writes pixels start to start + count - 1 of a row, one byte (0 or 1) each. Calls stay
 // inside this file, so that they are direct.
-inline void DecodeRuns(const unsigned char* runs, std::size_t runCount, unsigned long start,
-                       unsigned long count, unsigned char* out) {
+inline void DecodeRuns(const unsigned char* runs, std::size_t runCount, std::uint64_t start,
+                       std::uint64_t count, unsigned char* out) {
     std::size_t run = 0;
     std::uint64_t length = 0;  // pixels of the current value from `out` on
     bool value = false;
@@ -111,6 +113,25 @@ void AppendRowRuns(const unsigned char* data, std::size_t count, detail::ByteSin
         sink);
 }
 
+// Throws unless the buffer holds the width bytes read from the first byte of each row's
+// first visible pixel: a raster without a buffer, without channels or with samples of 0
+// bits (every row starts at the first byte) cannot give a row of width mask bytes.
+void CheckRowsReadable(const Raster& raster) {
+    if (raster.width == 0 || raster.height == 0) {
+        return;
+    }
+    const std::uint64_t lastRow = detail::PixelByte(
+        raster, raster.xMargin, std::uint64_t{raster.yMargin} + raster.height - 1);
+    if (detail::SaturatingSum(lastRow, raster.width) > detail::BufferBytes(raster)) {
+        throw kora::DataException(
+            "The raster buffer does not hold one byte per pixel of every row to compress",
+            kSourcePath,
+            "__cdecl kora::kubo::LineRLECompressedBitMask::LineRLECompressedBitMask(class "
+            "kora::kubo::Raster &)",
+            0);
+    }
+}
+
 }  // namespace
 
 /// Where each row's runs are (null while the row is empty) and how many there are.
@@ -139,15 +160,17 @@ LineRLECompressedBitMask::LineRLECompressedBitMask(unsigned int maskWidth, unsig
 
 LineRLECompressedBitMask::LineRLECompressedBitMask(Raster& raster)
     : LineRLECompressedBitMask(raster.width, raster.height) {
-    // Rasters place a pixel at its bit offset divided by 8.
-    const std::uint64_t pixelBits = std::uint64_t{raster.channels} * raster.dataType.bits *
-                                    (raster.dataType.isComplex ? 2u : 1u);
+    CheckRowsReadable(raster);
     detail::ByteSink sink(std::size_t{raster.height} * 16 + 16);  // grows for busy masks
     std::vector<std::size_t> ends(raster.height);
     for (unsigned int row = 0; row < raster.height; ++row) {
-        const std::uint64_t pixel =
-            (std::uint64_t{raster.yMargin} + row) * raster.lineStride + raster.xMargin;
-        AppendRowRuns(raster.data + pixel * pixelBits / 8, GetRowSize(), sink);
+        // An empty row reads nothing, so it needs no address (and a null buffer gets none).
+        const unsigned char* data =
+            GetRowSize() == 0
+                ? raster.data
+                : raster.data + detail::PixelByte(raster, raster.xMargin,
+                                                  std::uint64_t{raster.yMargin} + row);
+        AppendRowRuns(data, GetRowSize(), sink);
         ends[row] = sink.Size();
     }
     // The block has its final address only now.
@@ -171,15 +194,15 @@ LineRLECompressedBitMask& LineRLECompressedBitMask::operator=(
 }
 LineRLECompressedBitMask::~LineRLECompressedBitMask() = default;
 
-unsigned long LineRLECompressedBitMask::GetBytesPerPixel() const {
+std::uint64_t LineRLECompressedBitMask::GetBytesPerPixel() const {
     return (m_info.dataType.bits + 7u) / 8u;
 }
 
-unsigned long LineRLECompressedBitMask::GetRowSize() const {
+std::uint64_t LineRLECompressedBitMask::GetRowSize() const {
     return GetBytesPerPixel() * m_info.channels * m_info.width;
 }
 
-unsigned long LineRLECompressedBitMask::GetBufferSize() const {
+std::uint64_t LineRLECompressedBitMask::GetBufferSize() const {
     return GetRowSize() * m_info.height;
 }
 
@@ -188,15 +211,17 @@ const unsigned char* LineRLECompressedBitMask::GetCompressedRow(unsigned long ro
 }
 
 unsigned int LineRLECompressedBitMask::GetCompressedRowSize(unsigned long row) const {
-    return static_cast<unsigned int>(m_rows->Runs(row).size);
+    return detail::Count32(m_rows->Runs(row).size, "A compressed row size", kSourcePath,
+                           "unsigned int __cdecl kora::kubo::LineRLECompressedBitMask::"
+                           "GetCompressedRowSize(unsigned long) const");
 }
 
 std::unique_ptr<unsigned char[]> LineRLECompressedBitMask::Compress(unsigned char* data,
-                                                                    unsigned long count,
-                                                                    unsigned long& size) {
+                                                                    std::uint64_t count,
+                                                                    std::uint64_t& size) {
     detail::ByteSink sink(count + 1);  // the most a row can take
     AppendRowRuns(data, count, sink);
-    size = static_cast<unsigned long>(sink.Size());
+    size = static_cast<std::uint64_t>(sink.Size());
     std::unique_ptr<unsigned char[]> runs(new unsigned char[size]);
     std::memcpy(runs.get(), sink.Data(), size);
     return runs;
@@ -206,7 +231,7 @@ void LineRLECompressedBitMask::CompressRow(unsigned char* data, unsigned long ro
     if (row >= m_info.height) {
         return;
     }
-    unsigned long size = 0;
+    std::uint64_t size = 0;
     std::unique_ptr<unsigned char[]> runs = Compress(data, GetRowSize(), size);
     m_rows->rows[row] = {runs.get(), size};
     m_rows->owned[row] = std::move(runs);  // releases the buffer the row had, if any
@@ -220,8 +245,8 @@ void LineRLECompressedBitMask::DecodeRow(unsigned long row, unsigned char* out) 
     DecodePartialRow(row, 0, GetRowSize(), out);
 }
 
-void LineRLECompressedBitMask::DecodePartialRow(unsigned long row, unsigned long start,
-                                                unsigned long count, unsigned char* out) const {
+void LineRLECompressedBitMask::DecodePartialRow(unsigned long row, std::uint64_t start,
+                                                std::uint64_t count, unsigned char* out) const {
     const RowTable::Row runs = m_rows->Runs(row);
     DecodeRuns(runs.runs, runs.size, start, count, out);
 }
@@ -261,20 +286,20 @@ void LineRLECompressedBitMask::Decode(int x, int y, int w, int h, unsigned char*
 }
 
 void LineRLECompressedBitMask::DecodeWindow(int x, int y, int w, int h, unsigned char* out,
-                                            unsigned long capacity) const {
-    const unsigned long count = w > 0 ? static_cast<unsigned long>(w) : 0;
+                                            std::uint64_t capacity) const {
+    const std::uint64_t count = w > 0 ? static_cast<std::uint64_t>(w) : 0;
     if (count == 0 && x == 0) {
         return;  // nothing to write and no start to look for, however many rows
     }
     // A negative x wraps to a start past every row, a negative row to an index past the
     // last one; the sum is 64-bit so that it cannot wrap.
-    const unsigned long spacing = count * GetBytesPerPixel();
+    const std::uint64_t spacing = count * GetBytesPerPixel();
     const RowTable& table = *m_rows;
-    unsigned long o = 0;
+    std::uint64_t o = 0;
     for (long long row = y; row < static_cast<long long>(y) + h && o < capacity;
          ++row, o += spacing) {
-        const RowTable::Row runs = table.Runs(static_cast<unsigned long>(row));
-        DecodeRuns(runs.runs, runs.size, static_cast<unsigned long>(x),
+        const RowTable::Row runs = table.Runs(static_cast<std::uint64_t>(row));
+        DecodeRuns(runs.runs, runs.size, static_cast<std::uint64_t>(x),
                    std::min(count, capacity - o), out + o);
     }
 }

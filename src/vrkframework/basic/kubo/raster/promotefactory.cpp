@@ -14,7 +14,9 @@
 
 namespace kora::kubo {
 
-#define KUBO_DETAIL_INSTANTIATE_INNER_FACTORY(T) template class PromoteFactory::InnerFactory<T>;
+#define KUBO_DETAIL_INSTANTIATE_INNER_FACTORY(T)    \
+    template class detail::PackedPromoteFactory<T>; \
+    template class PromoteFactory::InnerFactory<T>;
 KUBO_FOR_EACH_COMPONENT_TYPE(KUBO_DETAIL_INSTANTIATE_INNER_FACTORY)
 #undef KUBO_DETAIL_INSTANTIATE_INNER_FACTORY
 

@@ -1,4 +1,4 @@
-// Member bodies of PromoteFactory::InnerFactory, instantiated by promotefactory.cpp.
+// Member bodies of the inner factories, instantiated by promotefactory.cpp.
 #ifndef VRKFRAMEWORK_BASIC_KUBO_RASTER_PROMOTEFACTORY_IMPL_H
 #define VRKFRAMEWORK_BASIC_KUBO_RASTER_PROMOTEFACTORY_IMPL_H
 
@@ -35,11 +35,9 @@ typeconv::IPromote* NewSpecialPromote(unsigned int bits, bool pack, std::index_s
     return kCreators[bits](pack);
 }
 
-}  // namespace detail
-
 template <class T>
-typeconv::IPromote* PromoteFactory::InnerFactory<T>::Create(const DataType& from,
-                                                            const DataType& to) const {
+typeconv::IPromote* PackedPromoteFactory<T>::Create(const DataType& from,
+                                                    const DataType& to) const {
     if constexpr (std::is_floating_point_v<T>) {
         return nullptr;
     } else {
@@ -49,13 +47,14 @@ typeconv::IPromote* PromoteFactory::InnerFactory<T>::Create(const DataType& from
             bits = to.bits;
             pack = true;
         }
-        if (bits == 0 || bits > detail::kLargestPackedBits) {
+        if (bits == 0 || bits > kLargestPackedBits) {
             return nullptr;
         }
-        return detail::NewSpecialPromote<T>(
-            bits, pack, std::make_index_sequence<detail::kLargestPackedBits + 1>());
+        return NewSpecialPromote<T>(bits, pack, std::make_index_sequence<kLargestPackedBits + 1>());
     }
 }
+
+}  // namespace detail
 
 }  // namespace kora::kubo
 

@@ -1,25 +1,60 @@
 // Raster buffers: size arithmetic and ownership.
 #include "vrkframework/basic/kubo/raster/raster.h"
 
+#include <cstdint>  // UINT32_MAX
 #include <cstring>  // std::memcpy
+#include <string>   // std::to_string
 #include <utility>  // std::move
 
+#include "vrkframework/basic/kubo/raster/bufferextent.h"
+#include "vrkframework/platform/exception.h"
+
 namespace kora::kubo {
+namespace {
+
+constexpr char kSourcePath[] = "vrkframework/basic/kubo/raster/raster";
+
+// The byte count of the buffer, checked before anything is set: the line stride and the
+// buffer height are 32-bit fields, so a larger full extent (most often a negative margin
+// cast to unsigned) has no consistent description, nor has a byte count beyond 64 bits.
+std::uint64_t CheckedByteSize(const RasterInfo& info, const RasterContext& context) {
+    const std::uint64_t fullWidth = detail::FullExtent(info.width, context.xMargin);
+    const std::uint64_t fullHeight = detail::FullExtent(info.height, context.yMargin);
+    const std::uint64_t bytes = detail::SaturatingProduct(
+        detail::SaturatingProduct(detail::BufferPixels(info, context), info.channels),
+        detail::SampleBytes(info.dataType));
+    const std::string extent = "A raster of " + std::to_string(fullWidth) + " x " +
+                               std::to_string(fullHeight) + " pixels (margins included)";
+    const char* limit = fullWidth > UINT32_MAX || fullHeight > UINT32_MAX
+                            ? " exceeds 4294967295 pixels a side"
+                        : bytes == detail::kUnbounded ? " exceeds 2^64 bytes"
+                                                      : nullptr;
+    if (limit != nullptr) {
+        throw kora::OutOfBoundsException(
+            {detail::SaturatedInt(fullWidth), detail::SaturatedInt(fullHeight)}, extent + limit,
+            kSourcePath,
+            "__cdecl kora::kubo::Raster::Raster(const class kora::kubo::RasterInfo &,const "
+            "class kora::kubo::RasterContext &)",
+            0);
+    }
+    return bytes;
+}
+
+}  // namespace
 
 Raster::Raster() : lineStride(0), bufferHeight(0), data(nullptr), byteSize(0), ownsData(false) {}
 
 Raster::Raster(const RasterInfo& info, const RasterContext& context)
     : RasterInfo(info),
       RasterContext(context),
-      lineStride(info.width + 2 * context.xMargin),
-      bufferHeight(info.height + 2 * context.yMargin),
+      lineStride(0),
+      bufferHeight(0),
       data(nullptr),
-      byteSize(0),
+      // The per-sample byte count rounds up, so a 1U raster gets one byte per sample.
+      byteSize(CheckedByteSize(info, context)),
       ownsData(true) {
-    // The per-sample byte count rounds up, so a 1U raster gets one byte per sample.
-    const std::uint64_t sampleBytes = (info.dataType.bits + 7u) / 8u;
-    byteSize = sampleBytes * (info.dataType.isComplex ? 2u : 1u) * bufferHeight * lineStride *
-               info.channels;
+    lineStride = info.width + 2 * context.xMargin;
+    bufferHeight = info.height + 2 * context.yMargin;
     data = new unsigned char[byteSize];
 }
 

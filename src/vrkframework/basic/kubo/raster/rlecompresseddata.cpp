@@ -6,6 +6,7 @@
 #include <cstring>    // std::memcpy
 
 #include "vrkframework/basic/kubo/raster/bytesink.h"
+#include "vrkframework/basic/kubo/raster/count32.h"
 #include "vrkframework/basic/kubo/raster/decodedbytes.h"
 #include "vrkframework/basic/kubo/raster/wordscan.h"
 #include "vrkframework/platform/exception.h"
@@ -155,6 +156,12 @@ RLECompressedData& RLECompressedData::operator=(RLECompressedData&& other) noexc
 }
 RLECompressedData::~RLECompressedData() = default;
 
+unsigned int RLECompressedData::GetCompressedSize() const {
+    return detail::Count32(
+        m_size, "A compressed size", kSourcePath,
+        "unsigned int __cdecl kora::kubo::RLECompressedData::GetCompressedSize(void) const");
+}
+
 std::size_t RLECompressedData::GetRasterSize() const {
     return std::size_t{m_info.width} * m_info.height * m_info.channels *
            ((m_info.dataType.bits + 7u) / 8u);
@@ -231,21 +238,23 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
     if (h < 1 || w < 1) {
         return;
     }
-    // Positions, the running total and the run count-down are 32-bit unsigned and wrap
-    // as such; a negative x or y wraps into a position far out.
-    const std::uint32_t pixel = ((m_info.dataType.bits + 7u) / 8u) * m_info.channels;
-    const std::uint32_t stride = m_info.width * pixel;
-    std::uint32_t start =
-        (m_info.width * static_cast<std::uint32_t>(y) + static_cast<std::uint32_t>(x)) * pixel;
+    // Positions, the running total and the run count-down are 64-bit unsigned, so no
+    // position of a raster wraps; a negative x or y wraps into a position past the stream.
+    const std::uint64_t pixel = std::uint64_t{(m_info.dataType.bits + 7u) / 8u} * m_info.channels;
+    const std::uint64_t stride = m_info.width * pixel;
+    std::uint64_t start =
+        (std::uint64_t{m_info.width} * static_cast<std::uint64_t>(std::int64_t{y}) +
+         static_cast<std::uint64_t>(std::int64_t{x})) *
+        pixel;
     const auto rowBytes = static_cast<std::size_t>(w);
     const PairStream pairs(m_buffer.get(), m_size);
     std::size_t pair = 0;
-    std::uint32_t total = 0;
+    std::uint64_t total = 0;
     for (std::size_t o = 0; h > 0 && o < capacity; --h, o += rowBytes, start += stride) {
         // Seek: add counts until the total passes the row's start, four pairs at a time
         // while all four stay at or below it. Past the stream nothing is added.
         while (total <= start && pair < pairs.Size()) {
-            if (pairs.Size() - pair >= 4 && std::uint64_t{total} + pairs.SumOfFour(pair) <= start) {
+            if (pairs.Size() - pair >= 4 && total + pairs.SumOfFour(pair) <= start) {
                 total += pairs.SumOfFour(pair);
                 pair += 4;
             } else {
@@ -254,7 +263,7 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
         }
         // The step back is taken on every row, also when the seek added nothing.
         --pair;
-        std::uint32_t remaining = total - start;
+        std::uint64_t remaining = total - start;
         unsigned char value = pairs.Value(pair);
         total -= pairs.Count(pair);
 
@@ -269,11 +278,13 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
             }
             // An empty pair (only past the stream) makes the count-down wrap, so its
             // value covers the rest of the row.
-            const std::size_t run = remaining == 0 ? left : std::min<std::size_t>(remaining, left);
+            const std::size_t run =
+                remaining == 0 ? left
+                               : static_cast<std::size_t>(std::min<std::uint64_t>(remaining, left));
             detail::FillBytes(row, value, run);
             row += run;
             left -= run;
-            remaining -= static_cast<std::uint32_t>(run);
+            remaining -= run;
         }
     }
 }
