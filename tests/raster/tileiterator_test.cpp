@@ -128,6 +128,31 @@ TEST(TileIterator, Failures) {
     }
 }
 
+// Ends and indices are 32-bit: an area reaching past 4294967295 and a cut into more tiles
+// than an unsigned int counts are refused, the previous cut kept.
+TEST(TileIterator, RefusesWhatItsFieldsCannotDescribe) {
+    const auto area =
+        kubo_test::Catch<kora::OutOfBoundsException>([] { TileIterator(4294967000u, 0, 296, 10); });
+    ASSERT_TRUE(area.has_value());
+    kubo_test::ExpectReport(*area, "An area of 296 pixels from 4294967000 ends past 4294967295",
+                            kSource,
+                            "__cdecl kora::kubo::TileIterator::TileIterator(unsigned "
+                            "int,unsigned int,unsigned int,unsigned int)",
+                            0);
+    TileIterator last(4294967000u, 0, 295, 10);
+    const Tile end = last.GetTile(last.GetTileRange());
+    EXPECT_EQ(end.xOffset + end.xSize, 4294967295u);
+
+    TileIterator gigapixel(66000, 66000);
+    const auto cut =
+        kubo_test::Catch<kora::OutOfBoundsException>([&] { gigapixel.SetChunkSize(1u, 1u); });
+    ASSERT_TRUE(cut.has_value());
+    kubo_test::ExpectReport(
+        *cut, "A cut into 4356000000 tiles exceeds 4294967295 tiles", kSource,
+        "unsigned int __cdecl kora::kubo::TileIterator::Cuthem(unsigned int,unsigned int)", 0);
+    EXPECT_EQ(gigapixel.GetTileRange(), 15u);
+}
+
 // An empty cut only arises in a subclass; the range then wraps.
 class EmptyCut : public TileIterator {
 public:

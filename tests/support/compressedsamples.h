@@ -3,7 +3,7 @@
 #define KUBO_TESTS_SUPPORT_COMPRESSEDSAMPLES_H
 
 #include <cstddef>  // std::size_t
-#include <cstdint>  // std::uint32_t
+#include <cstdint>  // std::int64_t, std::uint64_t
 #include <memory>   // std::unique_ptr
 #include <random>
 #include <vector>
@@ -59,22 +59,23 @@ inline Bytes Take(unsigned char* buffer, std::size_t count) {
 
 /// The window rule of the (count, value) pair stream written out byte by byte, as the
 /// oracle of the optimised decoder: a running total that grows by the count of every
-/// pair entered, a step back on every row, 32-bit unsigned arithmetic, and pairs past the
-/// stream read as empty pairs of value 0.
-inline Bytes PairWindowReference(const unsigned char* pairs, std::size_t size, std::uint32_t width,
-                                 std::uint32_t pixelBytes, int x, int y, int w, int h) {
+/// pair entered, a step back on every row, 64-bit unsigned arithmetic (a negative x or y
+/// wraps), and pairs past the stream read as empty pairs of value 0.
+inline Bytes PairWindowReference(const unsigned char* pairs, std::size_t size, std::uint64_t width,
+                                 std::uint64_t pixelBytes, int x, int y, int w, int h) {
     const std::size_t pairCount = size / 2;
-    const auto count = [&](std::size_t p) -> std::uint32_t {
+    const auto count = [&](std::size_t p) -> std::uint64_t {
         return p < pairCount ? pairs[2 * p] : 0u;
     };
     const auto value = [&](std::size_t p) -> unsigned char {
         return p < pairCount ? pairs[2 * p + 1] : 0;
     };
     Bytes out;
-    std::uint32_t start =
-        (width * static_cast<std::uint32_t>(y) + static_cast<std::uint32_t>(x)) * pixelBytes;
+    std::uint64_t start = (width * static_cast<std::uint64_t>(std::int64_t{y}) +
+                           static_cast<std::uint64_t>(std::int64_t{x})) *
+                          pixelBytes;
     std::size_t p = 0;
-    std::uint32_t total = 0;
+    std::uint64_t total = 0;
     for (int row = 0; row < h; ++row) {
         if (total <= start) {
             do {
@@ -86,7 +87,7 @@ inline Bytes PairWindowReference(const unsigned char* pairs, std::size_t size, s
             } while (!(total > start));
         }
         p -= 1;
-        std::uint32_t remaining = total - start;
+        std::uint64_t remaining = total - start;
         unsigned char current = value(p);
         total -= count(p);
         for (int i = 0; i < w; ++i) {

@@ -1,15 +1,40 @@
 // Tile cutting and walking.
 #include "vrkframework/basic/kubo/raster/tileiterator.h"
 
-#include <climits>  // INT_MAX
+#include <climits>  // INT_MAX, UINT_MAX
 #include <cmath>    // std::ceil, std::sqrt
+#include <cstdint>  // std::uint64_t
+#include <string>   // std::to_string
 
+#include "vrkframework/basic/kubo/raster/bufferextent.h"
 #include "vrkframework/platform/exception.h"
 
 namespace kora::kubo {
 namespace {
 
 constexpr char kSourcePath[] = "vrkframework/basic/kubo/raster/tileiterator";
+
+// One past the last column or line of an area: its end is a 32-bit field, so an area that
+// reaches past 4294967295 has no consistent description.
+unsigned int AreaEnd(unsigned int offset, unsigned int size) {
+    const std::uint64_t end = std::uint64_t{offset} + size;
+    if (end > UINT_MAX) {
+        throw kora::OutOfBoundsException(
+            {detail::SaturatedInt(offset), detail::SaturatedInt(size)},
+            "An area of " + std::to_string(size) + " pixels from " + std::to_string(offset) +
+                " ends past 4294967295",
+            kSourcePath,
+            "__cdecl kora::kubo::TileIterator::TileIterator(unsigned int,unsigned int,unsigned "
+            "int,unsigned int)",
+            0);
+    }
+    return static_cast<unsigned int>(end);
+}
+
+// Tiles of a cut along one direction: ceil(extent / size), in 64 bits.
+std::uint64_t TilesAlong(unsigned int start, unsigned int end, unsigned int size) {
+    return start < end ? (std::uint64_t{end} - start + size - 1) / size : 0;
+}
 
 }  // namespace
 
@@ -25,13 +50,15 @@ TileIterator::TileIterator(unsigned int xSize, unsigned int ySize)
 
 TileIterator::TileIterator(unsigned int xOffset, unsigned int yOffset, unsigned int xSize,
                            unsigned int ySize)
-    : xEnd(xOffset + xSize), yEnd(yOffset + ySize), xStart(xOffset), yStart(yOffset), current(0) {
+    : xEnd(0), yEnd(0), xStart(xOffset), yStart(yOffset), current(0) {
     if (xSize == 0 || ySize == 0) {
         throw kora::DataException("Invalid windows size", kSourcePath,
                                   "__cdecl kora::kubo::TileIterator::TileIterator(unsigned "
                                   "int,unsigned int,unsigned int,unsigned int)",
                                   61);
     }
+    xEnd = AreaEnd(xOffset, xSize);
+    yEnd = AreaEnd(yOffset, ySize);
     Cuthem(xSize / 4, ySize / 4);
 }
 
@@ -71,8 +98,19 @@ unsigned int TileIterator::Cuthem(unsigned int tileXSize, unsigned int tileYSize
     if (tileYSize == 0) {
         tileYSize = yEnd;
     }
-    current = 0;
-    tiles.clear();
+    // The count is known before the cut: one that its 32-bit indices cannot address is
+    // refused, and the room for the rest is taken at once, so that a cut too large for
+    // memory fails before it starts and keeps the previous one.
+    const std::uint64_t count =
+        TilesAlong(xStart, xEnd, tileXSize) * TilesAlong(yStart, yEnd, tileYSize);
+    if (count > UINT_MAX) {
+        throw kora::OutOfBoundsException(
+            {detail::SaturatedInt(tileXSize), detail::SaturatedInt(tileYSize)},
+            "A cut into " + std::to_string(count) + " tiles exceeds 4294967295 tiles", kSourcePath,
+            "unsigned int __cdecl kora::kubo::TileIterator::Cuthem(unsigned int,unsigned int)", 0);
+    }
+    std::vector<Tile> cut;
+    cut.reserve(static_cast<std::size_t>(count));
     // 64-bit positions: a step past xEnd near the top of the unsigned range must not wrap.
     for (unsigned long long y = yStart; y < yEnd; y += tileYSize) {
         const auto top = static_cast<unsigned int>(y);
@@ -80,9 +118,11 @@ unsigned int TileIterator::Cuthem(unsigned int tileXSize, unsigned int tileYSize
         for (unsigned long long x = xStart; x < xEnd; x += tileXSize) {
             const auto left = static_cast<unsigned int>(x);
             const unsigned int w = x + tileXSize >= xEnd ? xEnd - left : tileXSize;
-            tiles.push_back(Tile{left, top, w, h});
+            cut.push_back(Tile{left, top, w, h});
         }
     }
+    tiles.swap(cut);
+    current = 0;
     return static_cast<unsigned int>(tiles.size());
 }
 
