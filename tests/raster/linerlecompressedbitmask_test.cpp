@@ -200,7 +200,7 @@ TEST(LineRLECompressedBitMask, AStartPastTheRowsRunsIsNotFound) {
 
 // A raster whose buffer cannot give one byte per pixel of every visible row is refused
 // before anything is read: no channels or 0-bit samples (every row then starts at byte 0
-// of a 0-byte buffer), no buffer, or a byte size short of the last row.
+// of a 0-byte buffer), no buffer, or a byte size short of the last row; so are null rows.
 TEST(LineRLECompressedBitMask, RefusesRastersWhoseBufferDoesNotHoldTheRows) {
     Raster noChannels(RasterInfo(4, 2, 0, DataType::Type8U), RasterContext());
     Raster noBits(RasterInfo(4, 2, 1, DataType()), RasterContext(1, 1, 0, 0));
@@ -220,6 +220,17 @@ TEST(LineRLECompressedBitMask, RefusesRastersWhoseBufferDoesNotHoldTheRows) {
             "kora::kubo::Raster &)",
             0);
     }
+    // Row operations need a buffer when the row has pixels.
+    LineRLECompressedBitMask mask(4, 2);
+    const auto compress =
+        kubo_test::Catch<kora::DataException>([&] { mask.CompressRow(nullptr, 0); });
+    ASSERT_TRUE(compress.has_value());
+    EXPECT_EQ(compress->GetMessage(), "pBuffer is NULL, cannot compress NULL buffer");
+    const auto decode = kubo_test::Catch<kora::DataException>([&] { mask.DecodeRow(0, nullptr); });
+    ASSERT_TRUE(decode.has_value());
+    EXPECT_EQ(decode->GetFunction(),
+              "void __cdecl kora::kubo::LineRLECompressedBitMask::DecodeRow(unsigned long,unsigned "
+              "char *) const");
     // An empty visible area reads nothing, whatever the buffer.
     Raster empty(RasterInfo(0, 3, 0, DataType()), RasterContext());
     EXPECT_EQ(LineRLECompressedBitMask(empty).GetCompressedRowSize(2), 1u);

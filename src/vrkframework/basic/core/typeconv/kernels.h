@@ -71,6 +71,15 @@ KUBO_API const KernelSet& ActiveKernels();
 KUBO_API void RunPromote(const KernelSet& kernels, SampleLayout layout, std::size_t from,
                          std::size_t to, const void* src, void* dst, std::size_t count);
 
+/// Reports a null source or destination for a conversion that has samples to convert
+/// (kora::DataException): no buffer can be read or written at a null address.
+[[noreturn]] KUBO_API void ThrowNullBuffer();
+inline void CheckBuffers(const void* src, const void* dst, std::size_t count) {
+    if (count != 0 && (src == nullptr || dst == nullptr)) {
+        ThrowNullBuffer();
+    }
+}
+
 /// The bit-depth kernels treat counts as signed 32-bit values: below 1 converts nothing.
 constexpr bool IsPackedCountPositive(unsigned int count) {
     return count != 0 && count <= static_cast<unsigned int>(INT_MAX);

@@ -18,6 +18,7 @@ void PackedOperations<N, T, S>::Promote(const void* src, void* dst, unsigned int
             ThrowPackBitsTooWide(N, kComponentTypeNames[kIndex]);
         }
     } else if (IsPackedCountPositive(count)) {
+        CheckBuffers(src, dst, count);
         if constexpr (S == 0) {
             ActiveKernels().unpack[kIndex](static_cast<const unsigned char*>(src), dst, count, N);
         } else {

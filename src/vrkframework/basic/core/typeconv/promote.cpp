@@ -1,5 +1,5 @@
-// The real conversions of every pair of component types, and the failures of the
-// bit-depth kernels.
+// The real conversions of every pair of component types, and the failures every converter
+// reports.
 #include "vrkframework/basic/core/typeconv/promote.h"
 
 #include <string>
@@ -33,6 +33,12 @@ constexpr char kTooWide[] =
 }
 
 }  // namespace
+
+void ThrowNullBuffer() {
+    throw kora::DataException(
+        "A conversion buffer is NULL.", kSourcePath,
+        "void __cdecl typeconv::IPromote::Promote(const void *,void *,unsigned int)", 0);
+}
 
 void ThrowUnpackBitsTooWide(unsigned int bits, const char* typeName) {
     ThrowTooWide(bits, typeName, "Promote",

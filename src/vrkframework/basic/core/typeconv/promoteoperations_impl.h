@@ -9,6 +9,7 @@ namespace typeconv::detail {
 
 template <class A, class B, SampleLayout Layout>
 void PromoteOperations<A, B, Layout>::Promote(const void* src, void* dst, unsigned int count) {
+    CheckBuffers(src, dst, count);
     RunPromote(ActiveKernels(), Layout, ComponentIndexOf<A>(), ComponentIndexOf<B>(), src, dst,
                count);
 }

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "vrkframework/basic/kubo/masks/nodatarequest.h"
+#include "vrkframework/basic/kubo/masks/pixelflags.h"
 #include "vrkframework/basic/kubo/raster/bufferextent.h"
 #include "vrkframework/basic/kubo/raster/raster.h"
 
@@ -87,6 +88,7 @@ void MaskDecision::Update(const RasterInfo& info) {
 }
 
 void MaskDecision::Evaluate(const void* samples, unsigned char* flags, std::size_t count) {
+    detail::CheckFlagBuffers(flags, flags, count);
     if (m_impl) {
         m_impl->Evaluate(samples, flags, count);
     } else {
@@ -100,6 +102,7 @@ void MaskDecision::Evaluate(const Raster& raster, unsigned char* flags) {
 
 void MaskDecision::EvaluateRange(const Raster& raster, std::uint64_t first, std::size_t count,
                                  unsigned char* flags) {
+    detail::CheckFlagBuffers(flags, flags, count);
     Update(raster);
     std::size_t evaluated = 0;
     if (m_impl) {

@@ -104,8 +104,9 @@ Mask* MaskDecisionBuilder::BuildMask(const Raster& raster) const {
     try {
         // Only the library's own decision is evaluated piece by piece; a class derived from
         // it may override Evaluate, which must then be called.
-        if (m_decision != nullptr && typeid(*m_decision) == typeid(MaskDecision)) {
-            return BuildInPieces(static_cast<MaskDecision&>(*m_decision), raster);
+        IMaskDecision* decision = m_decision.get();
+        if (decision != nullptr && typeid(*decision) == typeid(MaskDecision)) {
+            return BuildInPieces(static_cast<MaskDecision&>(*decision), raster);
         }
         return BuildFromFlags(m_decision.get(), raster);
     } catch (const std::bad_alloc&) {

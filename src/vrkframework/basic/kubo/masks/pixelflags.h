@@ -8,8 +8,21 @@
 
 #include "vrkframework/basic/kubo/masks/bkgdrule.h"
 #include "vrkframework/basic/kubo/masks/vectorclones.h"
+#include "vrkframework/platform/exception.h"
 
 namespace kora::kubo::detail {
+
+/// Reports a null sample or flag buffer for pixels to flag (kora::DataException): the
+/// kernels read and write nothing else.
+inline void CheckFlagBuffers(const void* samples, const unsigned char* flags, std::size_t count) {
+    if (count != 0 && (samples == nullptr || flags == nullptr)) {
+        throw kora::DataException("A sample or flag buffer is NULL.",
+                                  "vrkframework/basic/kubo/masks/nodatamaskimpl",
+                                  "void __cdecl kora::kubo::IMaskDecisionImpl::Evaluate(const void "
+                                  "*,unsigned char *,unsigned __int64)",
+                                  0);
+    }
+}
 
 // The pair rule pairs samples k and k + 1 for every even k below the stride, so an odd
 // stride pairs its last sample with the first sample of the next pixel, tested as that
@@ -106,6 +119,7 @@ KUBO_INTERNAL auto TestsOf(const TestAt& testAt) {
 template <BkgdRule Rule, class T, class TestAt>
 KUBO_INTERNAL void FlagPixels(const T* samples, unsigned char* flags, std::size_t count,
                               std::size_t stride, const TestAt& testAt) {
+    CheckFlagBuffers(samples, flags, count);
     switch (stride) {
         case 1:
             return FlagFixedStride<Rule>(samples, flags, count, TestsOf<1>(testAt));

@@ -231,6 +231,12 @@ void LineRLECompressedBitMask::CompressRow(unsigned char* data, unsigned long ro
     if (row >= m_info.height) {
         return;
     }
+    if (data == nullptr && GetRowSize() != 0) {
+        throw kora::DataException("pBuffer is NULL, cannot compress NULL buffer", kSourcePath,
+                                  "void __cdecl kora::kubo::LineRLECompressedBitMask::CompressRow("
+                                  "unsigned char *,unsigned long)",
+                                  0);
+    }
     std::uint64_t size = 0;
     std::unique_ptr<unsigned char[]> runs = Compress(data, GetRowSize(), size);
     m_rows->rows[row] = {runs.get(), size};
@@ -242,6 +248,12 @@ unsigned char* LineRLECompressedBitMask::DecodeRow(unsigned long row) const {
 }
 
 void LineRLECompressedBitMask::DecodeRow(unsigned long row, unsigned char* out) const {
+    if (out == nullptr && GetRowSize() != 0) {
+        throw kora::DataException(kNullOutput, kSourcePath,
+                                  "void __cdecl kora::kubo::LineRLECompressedBitMask::DecodeRow("
+                                  "unsigned long,unsigned char *) const",
+                                  0);
+    }
     DecodePartialRow(row, 0, GetRowSize(), out);
 }
 
