@@ -6,6 +6,7 @@
 #include <cstring>
 #include <memory>
 #include <string>
+#include <tuple>
 #include <utility>
 #include <vector>
 
@@ -110,6 +111,33 @@ TEST(Raster, RefusesExtentsItsFieldsCannotDescribe) {
                                 0);
         EXPECT_EQ(failure->GetValues(), c.values);
     }
+}
+
+// A wrapping raster is described exactly as an owning one of the same shape, over the
+// caller's buffer, which it never frees.
+TEST(Raster, WrapRasterDescribesTheCallersBufferLikeAnOwningRaster) {
+    const RasterInfo info(10, 7, 3, DataType::TypeC16S);
+    const RasterContext context(2, 1, 30, 40);
+    const Raster owning(info, context);
+    std::vector<unsigned char> buffer(owning.byteSize);
+    const Raster wrapped = WrapRaster(buffer.data(), info, context);
+    EXPECT_EQ(std::make_tuple(wrapped.width, wrapped.height, wrapped.channels, wrapped.xMargin,
+                              wrapped.yMargin, wrapped.xOffset, wrapped.yOffset, wrapped.lineStride,
+                              wrapped.bufferHeight, wrapped.byteSize),
+              std::make_tuple(owning.width, owning.height, owning.channels, owning.xMargin,
+                              owning.yMargin, owning.xOffset, owning.yOffset, owning.lineStride,
+                              owning.bufferHeight, owning.byteSize));
+    EXPECT_EQ(wrapped.dataType, info.dataType);
+    EXPECT_EQ(wrapped.data, buffer.data());
+    EXPECT_FALSE(wrapped.ownsData);
+    const auto failure = kubo_test::Catch<kora::OutOfBoundsException>([] {
+        WrapRaster(nullptr, RasterInfo(4294967295u, 1, 1, DataType::Type8U),
+                   RasterContext(1, 0, 0, 0));
+    });
+    ASSERT_TRUE(failure.has_value());
+    EXPECT_EQ(failure->GetFunction(),
+              "class kora::kubo::Raster __cdecl kora::kubo::WrapRaster(unsigned char *,const class "
+              "kora::kubo::RasterInfo &,const class kora::kubo::RasterContext &)");
 }
 
 TEST(Raster, ForeignBuffersAreNeverFreed) {

@@ -40,6 +40,15 @@ private:
     void Release() noexcept;
 };
 
+/// A raster over a buffer its caller owns and keeps alive: `data` holds the full extent,
+/// ((bits + 7) / 8) x (2 if complex) x channels bytes a pixel, (height + 2 x yMargin) lines
+/// of width + 2 x xMargin pixels, starting with the top-left margin pixel. Every field is
+/// set as Raster(info, context) sets it (line stride, buffer height, byte size, margins,
+/// offsets), except that nothing is allocated and `ownsData` is false.
+/// @throws kora::OutOfBoundsException as Raster(info, context) does.
+KUBO_API Raster WrapRaster(unsigned char* data, const RasterInfo& info,
+                           const RasterContext& context);
+
 }  // namespace kora::kubo
 
 #endif  // VRKFRAMEWORK_BASIC_KUBO_RASTER_RASTER_H

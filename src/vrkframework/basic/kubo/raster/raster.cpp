@@ -17,7 +17,8 @@ constexpr char kSourcePath[] = "vrkframework/basic/kubo/raster/raster";
 // The byte count of the buffer, checked before anything is set: the line stride and the
 // buffer height are 32-bit fields, so a larger full extent (most often a negative margin
 // cast to unsigned) has no consistent description, nor has a byte count beyond 64 bits.
-std::uint64_t CheckedByteSize(const RasterInfo& info, const RasterContext& context) {
+std::uint64_t CheckedByteSize(const RasterInfo& info, const RasterContext& context,
+                              const char* function) {
     const std::uint64_t fullWidth = detail::FullExtent(info.width, context.xMargin);
     const std::uint64_t fullHeight = detail::FullExtent(info.height, context.yMargin);
     const std::uint64_t bytes = detail::SaturatingProduct(
@@ -32,10 +33,7 @@ std::uint64_t CheckedByteSize(const RasterInfo& info, const RasterContext& conte
     if (limit != nullptr) {
         throw kora::OutOfBoundsException(
             {detail::SaturatedInt(fullWidth), detail::SaturatedInt(fullHeight)}, extent + limit,
-            kSourcePath,
-            "__cdecl kora::kubo::Raster::Raster(const class kora::kubo::RasterInfo &,const "
-            "class kora::kubo::RasterContext &)",
-            0);
+            kSourcePath, function, 0);
     }
     return bytes;
 }
@@ -51,11 +49,28 @@ Raster::Raster(const RasterInfo& info, const RasterContext& context)
       bufferHeight(0),
       data(nullptr),
       // The per-sample byte count rounds up, so a 1U raster gets one byte per sample.
-      byteSize(CheckedByteSize(info, context)),
+      byteSize(
+          CheckedByteSize(info, context,
+                          "__cdecl kora::kubo::Raster::Raster(const class "
+                          "kora::kubo::RasterInfo &,const class kora::kubo::RasterContext &)")),
       ownsData(true) {
     lineStride = info.width + 2 * context.xMargin;
     bufferHeight = info.height + 2 * context.yMargin;
     data = new unsigned char[byteSize];
+}
+
+Raster WrapRaster(unsigned char* data, const RasterInfo& info, const RasterContext& context) {
+    Raster raster;
+    static_cast<RasterInfo&>(raster) = info;
+    static_cast<RasterContext&>(raster) = context;
+    raster.byteSize = CheckedByteSize(
+        info, context,
+        "class kora::kubo::Raster __cdecl kora::kubo::WrapRaster(unsigned char *,const class "
+        "kora::kubo::RasterInfo &,const class kora::kubo::RasterContext &)");
+    raster.lineStride = info.width + 2 * context.xMargin;
+    raster.bufferHeight = info.height + 2 * context.yMargin;
+    raster.data = data;
+    return raster;
 }
 
 Raster::Raster(const Raster& other)
