@@ -7,6 +7,7 @@
 #include <typeinfo>
 #include <vector>
 
+#include "support/datatypes.h"
 #include "support/expectfailure.h"
 #include "vrkframework/basic/core/typeconv/complex2realpromote.h"
 #include "vrkframework/basic/core/typeconv/complexpromote.h"
@@ -39,16 +40,8 @@ bool Creates(const DataType& from, const DataType& to) {
 
 DataType Packed(unsigned int bits) { return DataType(bits, false, false, bits, 0, false); }
 
-const DataType kPredefined[] = {DataType::Type1U,   DataType::Type8U,   DataType::Type8S,
-                                DataType::Type16U,  DataType::Type16S,  DataType::Type32U,
-                                DataType::Type32S,  DataType::Type32R,  DataType::Type64U,
-                                DataType::Type64S,  DataType::Type64R,  DataType::TypeC8U,
-                                DataType::TypeC8S,  DataType::TypeC16U, DataType::TypeC16S,
-                                DataType::TypeC32U, DataType::TypeC32S, DataType::TypeC32R,
-                                DataType::TypeC64U, DataType::TypeC64S, DataType::TypeC64R};
-
 TEST(PromoteFactory, EqualTypesNeedNoConversion) {
-    for (const DataType& type : kPredefined) {
+    for (const DataType& type : kubo_test::kPredefinedTypes) {
         EXPECT_EQ(Create(type, type), nullptr);
     }
     EXPECT_EQ(Create(Packed(12), Packed(12)), nullptr);

@@ -153,6 +153,17 @@ TEST(TileIterator, RefusesWhatItsFieldsCannotDescribe) {
     EXPECT_EQ(gigapixel.GetTileRange(), 15u);
 }
 
+// An end within 128 of 4294967295 is 2^32 in single precision: a count of 1 then sizes the
+// tiles 4294967295 wide, which still cut one tile across, instead of overflowing.
+TEST(TileIterator, SizingByCountNearTheTopOfTheRangeSpansTheArea) {
+    TileIterator whole(4294967295u, 8);
+    EXPECT_EQ(whole.SetNumberOfTiles(1), 1u);
+    EXPECT_EQ(Fields(whole.GetTile(0)), Box(0, 0, 4294967295u, 8));
+    TileIterator shifted(4294967000u, 0, 200, 8);
+    EXPECT_EQ(shifted.SetChunkSize(100000000000ul), 1u);  // ceil(8 x 4294967200 / 1e11) = 1
+    EXPECT_EQ(Fields(shifted.GetTile(0)), Box(4294967000u, 0, 200, 8));
+}
+
 // An empty cut only arises in a subclass; the range then wraps.
 class EmptyCut : public TileIterator {
 public:

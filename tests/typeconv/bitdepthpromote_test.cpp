@@ -13,6 +13,7 @@
 #include <vector>
 
 #include "support/expectfailure.h"
+#include "support/promotereference.h"
 #include "vrkframework/basic/core/typeconv/kernels.h"
 #include "vrkframework/basic/core/typeconv/packedpromote.h"
 #include "vrkframework/basic/kubo/raster/datatype.h"
@@ -21,6 +22,7 @@
 namespace {
 
 using kora::kubo::DataType;
+using kubo_test::StreamBytes;
 using typeconv::detail::KernelSet;
 using typeconv::detail::KernelVariant;
 
@@ -31,56 +33,6 @@ constexpr unsigned char kStale = 0xFF;
 constexpr std::size_t kGuard = 16;
 
 DataType Packed(unsigned int bits) { return DataType(bits, false, false, bits, 0, false); }
-
-std::size_t StreamBytes(std::size_t count, unsigned int bits) { return (count * bits + 7) / 8; }
-
-// Stream bit k is bit 7 - k % 8 of byte k / 8.
-bool StreamBit(const std::vector<unsigned char>& bytes, std::size_t k) {
-    return (bytes[k / 8] >> (7 - k % 8)) & 1;
-}
-void SetStreamBit(std::vector<unsigned char>& bytes, std::size_t k) {
-    bytes[k / 8] = static_cast<unsigned char>(bytes[k / 8] | 1 << (7 - k % 8));
-}
-
-/// The documented packing, bit by bit: each sample's N low bits, most significant first;
-/// a sample spanning bytes also ORs its value shifted right by the bits that follow its
-/// first byte into that byte (where bits above N-1 meet the previous sample).
-template <class T>
-std::vector<unsigned char> ReferencePack(const std::vector<T>& samples, unsigned int bits) {
-    std::vector<unsigned char> bytes(StreamBytes(samples.size(), bits), 0);
-    for (std::size_t i = 0; i < samples.size(); ++i) {
-        // As an infinite two's complement value: signed samples extend their sign.
-        const long long value =
-            std::is_signed_v<T> ? static_cast<long long>(samples[i])
-                                : static_cast<long long>(static_cast<std::uint64_t>(samples[i]));
-        const std::size_t first = i * bits;
-        for (unsigned int j = 0; j < bits; ++j) {
-            if ((value >> (bits - 1 - j)) & 1) {
-                SetStreamBit(bytes, first + j);
-            }
-        }
-        const unsigned int inFirstByte = 8 - static_cast<unsigned int>(first % 8);
-        if (bits > inFirstByte) {
-            const long long spill = value >> (bits - inFirstByte);
-            bytes[first / 8] = static_cast<unsigned char>(bytes[first / 8] | (spill & 0xFF));
-        }
-    }
-    return bytes;
-}
-
-template <class T>
-std::vector<T> ReferenceUnpack(const std::vector<unsigned char>& bytes, std::size_t count,
-                               unsigned int bits) {
-    std::vector<T> samples(count);
-    for (std::size_t i = 0; i < count; ++i) {
-        std::uint64_t value = 0;
-        for (unsigned int j = 0; j < bits; ++j) {
-            value = value << 1 | (StreamBit(bytes, i * bits + j) ? 1u : 0u);
-        }
-        samples[i] = static_cast<T>(value);
-    }
-    return samples;
-}
 
 template <class T>
 std::vector<T> RandomSamples(std::size_t count, unsigned int bits, bool overWide,
@@ -103,7 +55,8 @@ void CheckPack(const std::vector<T>& samples, unsigned int bits, const Pack& pac
     const std::size_t streamBytes = StreamBytes(samples.size(), bits);
     std::vector<unsigned char> bytes(streamBytes + kGuard, kStale);
     pack(samples.data(), bytes.data(), samples.size());
-    const std::vector<unsigned char> expected = ReferencePack(samples, bits);
+    const std::vector<unsigned char> expected =
+        kubo_test::ReferencePack(samples.data(), samples.size(), bits);
     ASSERT_EQ(std::vector<unsigned char>(bytes.begin(),
                                          bytes.begin() + static_cast<std::ptrdiff_t>(streamBytes)),
               expected)
@@ -120,7 +73,7 @@ void CheckUnpack(const std::vector<unsigned char>& stream, std::size_t count, un
     const T sentinel = static_cast<T>(0x5A);
     std::vector<T> samples(count + kGuard, sentinel);
     unpack(stream.data(), samples.data(), count);
-    const std::vector<T> expected = ReferenceUnpack<T>(stream, count, bits);
+    const std::vector<T> expected = kubo_test::ReferenceUnpack<T>(stream.data(), count, bits);
     ASSERT_EQ(std::vector<T>(samples.begin(), samples.begin() + static_cast<std::ptrdiff_t>(count)),
               expected)
         << where << ", " << bits << " bits, count " << count;
@@ -181,7 +134,8 @@ TYPED_TEST(BitDepth, PacksAndUnpacksEveryBitCountInEveryVariant) {
             if (count > 300) {
                 mixed[300] = overWide[300];
             }
-            const std::vector<unsigned char> stream = ReferencePack(samples, bits);
+            const std::vector<unsigned char> stream =
+                kubo_test::ReferencePack(samples.data(), count, bits);
             for (const auto& [name, pack] : packs) {
                 CheckPack(samples, bits, pack, name);
                 CheckPack(overWide, bits, pack, name + ", over-wide samples");

@@ -17,6 +17,7 @@
 #include <type_traits>
 #include <vector>
 
+#include "support/promotereference.h"
 #include "vrkframework/basic/core/typeconv/complex2realpromote.h"
 #include "vrkframework/basic/core/typeconv/complexpromote.h"
 #include "vrkframework/basic/core/typeconv/kernels.h"
@@ -28,116 +29,10 @@ using typeconv::detail::KernelSet;
 using typeconv::detail::KernelVariant;
 using typeconv::detail::SampleLayout;
 
-// ------------------------------------------------------------------ the reference
-
-template <class T>
-constexpr bool kSmallSigned = std::is_integral_v<T>&& std::is_signed_v<T> && sizeof(T) < 8;
-
-template <class T>
-long double High() {
-    return static_cast<long double>(std::numeric_limits<T>::max());
-}
-template <class T>
-long double Low() {
-    return static_cast<long double>(std::numeric_limits<T>::lowest());
-}
-
-// The documented result of NaN: INT32_MIN reduced to the width of B, or the top bit
-// alone in 64-bit destinations.
-template <class B>
-B NaNResult() {
-    if constexpr (sizeof(B) == 8) {
-        return static_cast<B>(std::uint64_t{1} << 63);
-    } else if constexpr (std::is_same_v<B, int>) {
-        return std::numeric_limits<int>::min();
-    } else {
-        return 0;
-    }
-}
-
-// x < y for integers of any two types, by value.
-template <class X, class Y>
-bool Less(X x, Y y) {
-    if constexpr (std::is_signed_v<X> == std::is_signed_v<Y>) {
-        return x < y;
-    } else if constexpr (std::is_signed_v<X>) {
-        return x < 0 || static_cast<std::uint64_t>(x) < static_cast<std::uint64_t>(y);
-    } else {
-        return y > 0 && static_cast<std::uint64_t>(x) < static_cast<std::uint64_t>(y);
-    }
-}
-
-template <class B, class A>
-B ExpectedFromInteger(A x) {
-    constexpr B kMax = std::numeric_limits<B>::max();
-    constexpr B kMin = std::numeric_limits<B>::lowest();
-    if constexpr (std::is_floating_point_v<B>) {
-        return static_cast<B>(x);  // the ordinary conversion: the nearest value
-    } else if constexpr (std::is_same_v<A, std::int64_t>) {
-        if constexpr (std::is_same_v<B, std::uint64_t>) {
-            return static_cast<B>(x);  // bit copy
-        } else {
-            return Less(x, kMax) ? static_cast<B>(x) : kMax;  // below the maximum: wraps
-        }
-    } else if constexpr (std::is_same_v<A, std::uint64_t>) {
-        return Less(kMax, x) ? kMax : static_cast<B>(x);
-    } else if constexpr (kSmallSigned<A> && sizeof(B) == 8) {
-        return x < 1 ? B(0) : static_cast<B>(x);
-    } else {
-        if (Less(kMax, x)) {
-            return kMax;
-        }
-        if (Less(x, kMin)) {
-            return kMin;
-        }
-        return static_cast<B>(x);
-    }
-}
-
-template <class B, class A>
-B ExpectedFromFloating(A x) {
-    if constexpr (std::is_floating_point_v<B>) {
-        return static_cast<B>(x);
-    } else {
-        if (std::isnan(x)) {
-            return NaNResult<B>();
-        }
-        const long double v = static_cast<long double>(x);
-        if constexpr (sizeof(B) == 8) {
-            const long double high = std::is_signed_v<B> ? 0x1p63L : 0x1p64L;
-            if (v <= 0) {
-                return 0;
-            }
-            if (v >= high) {
-                return std::numeric_limits<B>::max();
-            }
-            return static_cast<B>(std::trunc(v));
-        } else {
-            // y = x + 0.5 (or x - 0.5 for signed destinations below 0), one rounding to
-            // A; the thresholds are B's limits as values of A.
-            const long double half = std::is_signed_v<B> && v < 0 ? -0.5L : 0.5L;
-            const long double y = static_cast<long double>(static_cast<A>(v + half));
-            const long double high =
-                static_cast<long double>(static_cast<A>(std::numeric_limits<B>::max()));
-            if (y >= high) {
-                return std::numeric_limits<B>::max();
-            }
-            if (std::is_signed_v<B> ? y < Low<B>() : y <= 0) {
-                return std::numeric_limits<B>::lowest();
-            }
-            return static_cast<B>(std::trunc(y));
-        }
-    }
-}
-
-template <class B, class A>
-B Expected(A x) {
-    if constexpr (std::is_floating_point_v<A>) {
-        return ExpectedFromFloating<B>(x);
-    } else {
-        return ExpectedFromInteger<B>(x);
-    }
-}
+using kubo_test::Expected;
+using kubo_test::High;
+using kubo_test::Low;
+using kubo_test::SameValue;
 
 // ------------------------------------------------------------------ inputs
 
@@ -198,18 +93,6 @@ std::vector<A> Inputs() {
 }
 
 // ------------------------------------------------------------------ checking
-
-template <class B>
-bool SameValue(B actual, B expected) {
-    if constexpr (std::is_floating_point_v<B>) {
-        if (std::isnan(expected)) {
-            return std::isnan(actual);
-        }
-        return std::memcmp(&actual, &expected, sizeof actual) == 0;  // -0.0 is not 0.0
-    } else {
-        return actual == expected;
-    }
-}
 
 template <class T>
 std::string Show(T value) {

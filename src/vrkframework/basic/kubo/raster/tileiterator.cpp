@@ -31,6 +31,14 @@ unsigned int AreaEnd(unsigned int offset, unsigned int size) {
     return static_cast<unsigned int>(end);
 }
 
+// The tile size ceil(end / side) of a cut into side x side tiles, in single precision. An end
+// within 128 of 4294967295 rounds to 2^32 there, past the unsigned range; as any size from the
+// area's extent up cuts the same single column or row, the size saturates at 4294967295.
+unsigned int TileSizeFor(unsigned int end, float side) {
+    const float size = std::ceil(static_cast<float>(end) / side);
+    return size < 0x1p32f ? static_cast<unsigned int>(size) : UINT_MAX;
+}
+
 // Tiles of a cut along one direction: ceil(extent / size), in 64 bits.
 std::uint64_t TilesAlong(unsigned int start, unsigned int end, unsigned int size) {
     return start < end ? (std::uint64_t{end} - start + size - 1) / size : 0;
@@ -86,9 +94,7 @@ unsigned int TileIterator::SetNumberOfTiles(unsigned int count) {
     }
     // Single precision throughout, as the sizes of this cut have always been computed.
     const float side = std::sqrt(static_cast<float>(count));
-    const auto tileXSize = static_cast<unsigned int>(std::ceil(static_cast<float>(xEnd) / side));
-    const auto tileYSize = static_cast<unsigned int>(std::ceil(static_cast<float>(yEnd) / side));
-    return Cuthem(tileXSize, tileYSize);
+    return Cuthem(TileSizeFor(xEnd, side), TileSizeFor(yEnd, side));
 }
 
 unsigned int TileIterator::Cuthem(unsigned int tileXSize, unsigned int tileYSize) {
