@@ -4,12 +4,14 @@
 
 #include "vrkframework/platform/platformapi.h"
 
+/// The framework's coordinate systems, as far as control points carry one.
 namespace kora::ogc::cs {
 
 /// A coordinate reference system: its dimension and a way to copy it.
 class KORA_PLATFORM_API ICRS {
 public:
     virtual ~ICRS();
+    /// Number of coordinates of a position in this system.
     virtual unsigned int GetDimension() const = 0;
     /// Returns a new heap copy; the caller owns it.
     virtual ICRS* Clone() const = 0;

@@ -9,18 +9,28 @@
 
 #include "vrkframework/platform/platformapi.h"
 
+/// The framework the library is built against: its exceptions and string formatting.
 namespace kora {
 
 /// Base of every framework failure. `what()` returns the message.
 class KORA_PLATFORM_API Exception : public std::exception {
 public:
+    /// Records where the failure was raised: `sourceFile` is the implementation file below
+    /// the source root without extension (`vrkframework/basic/kubo/raster/tileiterator`),
+    /// `function` the full signature text of the throwing function, `line` the line of the
+    /// throw (0 for the failures this library adds to the framework's own).
     Exception(const std::string& message, const std::string& sourceFile,
               const std::string& function, unsigned int line);
 
+    /// The message; valid as long as the exception.
     const char* what() const noexcept override;
+    /// The message, as given to the constructor.
     const std::string& GetMessage() const;
+    /// The source path, as given to the constructor.
     const std::string& GetSourceFile() const;
+    /// The function signature text, as given to the constructor.
     const std::string& GetFunction() const;
+    /// The source line, as given to the constructor.
     unsigned int GetLine() const;
 
 private:
@@ -33,6 +43,7 @@ private:
 /// Raised when the data handed to an operation cannot be processed.
 class KORA_PLATFORM_API DataException : public Exception {
 public:
+    /// Takes the arguments of Exception.
     using Exception::Exception;
 };
 
@@ -46,14 +57,20 @@ public:
         PARAMETER_TOO_FEW_ITEMS = 8   ///< a collection holds fewer items than required
     };
 
+    /// `received` and `expected` describe the value given and the values accepted, as
+    /// text; the last four arguments are those of Exception.
     ParameterException(const std::string& parameterName, Type type, const std::string& received,
                        const std::string& expected, const std::string& message,
                        const std::string& sourceFile, const std::string& function,
                        unsigned int line);
 
+    /// Name of the faulty parameter.
     const std::string& GetParameterName() const;
+    /// Kind of fault.
     Type GetType() const;
+    /// Text describing the value received.
     const std::string& GetReceived() const;
+    /// Text describing the values accepted.
     const std::string& GetExpected() const;
 
 private:
@@ -67,10 +84,13 @@ private:
 /// the offending or bounding values.
 class KORA_PLATFORM_API OutOfBoundsException : public Exception {
 public:
+    /// `values` are the offending or bounding values; the other arguments are those of
+    /// Exception.
     OutOfBoundsException(const std::vector<int>& values, const std::string& message,
                          const std::string& sourceFile, const std::string& function,
                          unsigned int line);
 
+    /// The offending or bounding values, as given to the constructor.
     const std::vector<int>& GetValues() const;
 
 private:

@@ -4,8 +4,10 @@
 
 #include "vrkframework/platform/platformapi.h"
 
+/// Framework core services the library uses: the complex interpretations.
 namespace kora::core {
 
+/// How a complex sample (re, im) is read as one real value.
 enum KORAInterpretationTypes {
     INTERPRETATION_REAL = 0,       ///< real part
     INTERPRETATION_IMAGINARY = 1,  ///< imaginary part
@@ -15,6 +17,7 @@ enum KORAInterpretationTypes {
     INTERPRETATION_DB = 5          ///< 10 * log10(re^2 + im^2)
 };
 
+/// An interpretation: the real value of the complex sample (real, imaginary).
 using InterpretationFunction = double (*)(double real, double imaginary);
 
 /// Returns the function of an interpretation code; never null.

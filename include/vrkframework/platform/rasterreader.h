@@ -8,15 +8,20 @@ namespace kora::kubo {
 struct DataType;
 }
 
+/// The framework's raster sources, as far as the library reads them.
 namespace kora::datasources {
 
 /// A readable raster source, queried for its description.
 class KORA_PLATFORM_API IRasterReader {
 public:
     virtual ~IRasterReader();
+    /// Pixels per line.
     virtual unsigned int GetWidth() const = 0;
+    /// Number of lines.
     virtual unsigned int GetHeight() const = 0;
+    /// Samples per pixel.
     virtual unsigned int GetChannelCount() const = 0;
+    /// Type of one sample.
     virtual const kora::kubo::DataType& GetDataType() const = 0;
 };
 

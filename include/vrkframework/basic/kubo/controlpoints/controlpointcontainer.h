@@ -53,20 +53,43 @@ public:
     /// holds no CRS at all.
     void SetCRS(const kora::ogc::cs::ICRS& crs);
 
+    /// @name Control points
+    ///@{
+
+    /// The control points; none by default. The getters return the vector itself, to read
+    /// or change in place; the setter replaces it by a copy.
     std::vector<ControlPoint>& GetControlPoints() { return m_controlPoints; }
     const std::vector<ControlPoint>& GetControlPoints() const { return m_controlPoints; }
     void SetControlPoints(const std::vector<ControlPoint>& points) { m_controlPoints = points; }
+    ///@}
 
+    /// @name Description
+    ///@{
+
+    /// Free text describing the set; empty by default.
     const std::string& GetDescription() const { return m_description; }
     void SetDescription(const std::string& description) { m_description = description; }
+    ///@}
 
+    /// @name History
+    ///@{
+
+    /// The history; empty by default, and not copied with the container. The getters return
+    /// the vector itself, to read or change in place; the setter replaces it by a copy.
     std::vector<HistoryEvent>& GetHistory() { return m_history; }
     const std::vector<HistoryEvent>& GetHistory() const { return m_history; }
     void SetHistory(const std::vector<HistoryEvent>& history) { m_history = history; }
+    ///@}
 
+    /// @name Metadata
+    ///@{
+
+    /// The key/value metadata; empty by default. The getters return the map itself, to read
+    /// or change in place; the setter replaces it by a copy.
     KVPMetadata& GetKVPMetadata() { return m_metadata; }
     const KVPMetadata& GetKVPMetadata() const { return m_metadata; }
     void SetKVPMetadata(const KVPMetadata& metadata) { m_metadata = metadata; }
+    ///@}
 
 private:
     void Copy(const ControlPointContainer& other);

@@ -21,28 +21,43 @@ enum PopulatedAxesCode : int {
 /// Only a location creates, copies and destroys it; the arrays belong to that location.
 class KUBO_API GroundLocationPolicy {
 public:
+    /// Coordinate 0.
     double GetX() const { return m_coordinates[0]; }
+    /// Coordinate 1.
     double GetY() const { return m_coordinates[1]; }
+    /// Coordinate 2.
     double GetZ() const { return m_coordinates[2]; }
+    /// Sets the three coordinates; the populated-axes code is left alone.
     void SetCoords(double x, double y, double z) {
         m_coordinates[0] = x;
         m_coordinates[1] = y;
         m_coordinates[2] = z;
     }
+    /// Which axes hold measured values; ePopulatedAxesNone by default.
     PopulatedAxesCode GetPopulatedAxesCode() const { return m_populatedAxesCode; }
+    /// Stores `code` as given.
     void SetPopulatedAxesCode(PopulatedAxesCode code) { m_populatedAxesCode = code; }
 
 protected:
     GroundLocationPolicy() = default;
-    // Copies carry the code; the arrays are the owner's, which hands a copy new ones.
+
+    /// @name Copying
+    ///@{
+
+    /// Copies the populated-axes code only: the arrays are the owner's, and a copy's own
+    /// owner hands it new ones.
     GroundLocationPolicy(const GroundLocationPolicy& other) noexcept
         : m_populatedAxesCode(other.m_populatedAxesCode) {}
     GroundLocationPolicy& operator=(const GroundLocationPolicy& other) noexcept {
         m_populatedAxesCode = other.m_populatedAxesCode;
         return *this;
     }
+    ///@}
+
     ~GroundLocationPolicy() = default;
 
+    /// Points the accessors at the owning location's 3 coordinates and 3 matrix row
+    /// pointers; the location keeps ownership. Called by Location only.
     void SetSharedArrays(double* coordinates, double** matrix) {
         m_coordinates = coordinates;
         m_matrix = matrix;

@@ -11,10 +11,15 @@ namespace kora::kubo {
 /// Only a location creates, copies and destroys it; the arrays belong to that location.
 class KUBO_API ImageLocationPolicy {
 public:
+    /// Coordinate 0.
     double GetColumn() const { return m_coordinates[0]; }
+    /// Coordinate 1.
     double GetRow() const { return m_coordinates[1]; }
+    /// Sets coordinate 0.
     void SetColumn(double column) { m_coordinates[0] = column; }
+    /// Sets coordinate 1.
     void SetRow(double row) { m_coordinates[1] = row; }
+    /// Sets both coordinates.
     void SetCoords(double column, double row) {
         m_coordinates[0] = column;
         m_coordinates[1] = row;
@@ -22,11 +27,20 @@ public:
 
 protected:
     ImageLocationPolicy() = default;
-    // The arrays are the owner's: a copy waits for its own owner to hand it new ones.
+
+    /// @name Copying
+    ///@{
+
+    /// Copies nothing: the arrays are the owner's, and a copy's own owner hands it new
+    /// ones.
     ImageLocationPolicy(const ImageLocationPolicy&) noexcept {}
     ImageLocationPolicy& operator=(const ImageLocationPolicy&) noexcept { return *this; }
+    ///@}
+
     ~ImageLocationPolicy() = default;
 
+    /// Points the accessors at the owning location's 2 coordinates and 2 matrix row
+    /// pointers; the location keeps ownership. Called by Location only.
     void SetSharedArrays(double* coordinates, double** matrix) {
         m_coordinates = coordinates;
         m_matrix = matrix;

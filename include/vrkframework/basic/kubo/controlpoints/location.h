@@ -20,6 +20,12 @@ class Location : public Policy {
 
 public:
     Location() noexcept : m_coordinates{}, m_values{} { Share(); }
+
+    /// @name Copying
+    ///@{
+
+    /// Copies the values, never the arrays. The coordinates, the matrix entries and the
+    /// policy's state go into this location's own arrays, at which its policy keeps pointing.
     Location(const Location& other) noexcept
         : Policy(other), m_coordinates(other.m_coordinates), m_values(other.m_values) {
         Share();
@@ -30,18 +36,28 @@ public:
         m_values = other.m_values;
         return *this;
     }
+    ///@}
+
     ~Location() = default;
 
+    /// @name Comparison
+    ///@{
+
+    /// Compares the N coordinates and the N x N matrix entries exactly as doubles (a NaN
+    /// anywhere makes the locations unequal); the policy's state takes no part.
     bool operator==(const Location& other) const {
         return m_coordinates == other.m_coordinates && m_values == other.m_values;
     }
     bool operator!=(const Location& other) const { return !(*this == other); }
+    ///@}
 
     /// The N coordinates; the location keeps ownership.
     double* GetCoordinates() { return m_coordinates.data(); }
+    /// The N coordinates, read-only; the location keeps ownership.
     const double* GetCoordinates() const { return m_coordinates.data(); }
     /// N row pointers of N entries each; the location keeps ownership.
     double** GetMatrix() { return m_rows.data(); }
+    /// N row pointers of N entries each, read-only; the location keeps ownership.
     const double* const* GetMatrix() const { return m_rows.data(); }
 
 private:

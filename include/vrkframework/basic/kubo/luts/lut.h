@@ -15,6 +15,12 @@ namespace kora::kubo {
 ///
 /// Every table holds at least the breakpoints it was built from. There is no move: moving
 /// a table copies it, so no table is ever left without breakpoints.
+///
+/// From its base it offers, with `Entry` = std::pair<double, double> (input, output):
+/// `std::vector<Entry> GetEntries() const` and `void GetEntries(std::vector<Entry>& out)
+/// const` (copies of the breakpoints), `unsigned int GetEntryCount() const` and
+/// `void GetInputValueRange(double& min, double& max) const` (inputs of the first and the
+/// last breakpoint).
 class KUBO_API LUT : public detail::BreakpointTable<double> {
 public:
     /// A classic 8-bit table: breakpoint i is (i, values[i]).
@@ -26,8 +32,15 @@ public:
     explicit LUT(const std::vector<Entry>& entries);
     /// A classic 8-bit table from the 256 bytes at `values`, which must all be readable.
     explicit LUT(const unsigned char* values);
+
+    /// @name Copying
+    ///@{
+
+    /// Copies the breakpoints; moving does the same.
     LUT(const LUT& other) = default;
     LUT& operator=(const LUT& other) = default;
+    ///@}
+
     ~LUT() = default;
 
     /// The output for `x`. A whole `x` whose truncation indexes a breakpoint of that input

@@ -13,9 +13,9 @@ namespace kora::kubo {
 /// A colour: red, green and blue components in that order.
 template <class T>
 struct RGBTuple {
-    T r;
-    T g;
-    T b;
+    T r;  ///< red
+    T g;  ///< green
+    T b;  ///< blue
 };
 
 /// Maps a real input to a colour through breakpoints (input, colour) kept in ascending
@@ -25,8 +25,15 @@ struct RGBTuple {
 ///
 /// Every table holds at least the breakpoints it was built from. There is no move: moving
 /// a table copies it, so no table is ever left without breakpoints.
+///
+/// From its base it offers, with `Entry` = std::pair<double, Colour> (input, colour):
+/// `std::vector<Entry> GetEntries() const` and `void GetEntries(std::vector<Entry>& out)
+/// const` (copies of the breakpoints), `unsigned int GetEntryCount() const` and
+/// `void GetInputValueRange(double& min, double& max) const` (inputs of the first and the
+/// last breakpoint).
 class KUBO_API PCT : public detail::BreakpointTable<RGBTuple<unsigned char>> {
 public:
+    /// The colour of a breakpoint: one byte per component.
     using Colour = RGBTuple<unsigned char>;
 
     /// A classic 8-bit table: breakpoint i is (i, colours[i]).
@@ -40,8 +47,15 @@ public:
     /// which must all be readable: breakpoint i is (i, (planes[i], planes[256 + i],
     /// planes[512 + i])).
     explicit PCT(const unsigned char* planes);
+
+    /// @name Copying
+    ///@{
+
+    /// Copies the breakpoints; moving does the same.
     PCT(const PCT& other) = default;
     PCT& operator=(const PCT& other) = default;
+    ///@}
+
     ~PCT() = default;
 
     /// The colour for `x`, found as `LUT::GetValue` finds an output; between breakpoints

@@ -15,10 +15,17 @@ namespace kora::kubo {
 class KUBO_API CoordinateMaskBuilder : public IMaskBuilder {
 public:
     CoordinateMaskBuilder() = default;
+
+    /// @name Copying
+    ///@{
+
+    /// Copies the coordinates; moving takes them over.
     CoordinateMaskBuilder(const CoordinateMaskBuilder&) = default;
     CoordinateMaskBuilder& operator=(const CoordinateMaskBuilder&) = default;
     CoordinateMaskBuilder(CoordinateMaskBuilder&&) = default;
     CoordinateMaskBuilder& operator=(CoordinateMaskBuilder&&) = default;
+    ///@}
+
     ~CoordinateMaskBuilder() override;
 
     /// Inserts the pair in row-then-column order; a pair already held is not added again.
@@ -28,6 +35,7 @@ public:
 
     /// A new mask (the caller deletes it) with the held coordinates that fall inside the
     /// raster's image proper set; the margins are never set.
+    /// @throws kora::OutOfBoundsException as the Mask constructor does, before any work.
     Mask* BuildMask(const Raster& raster) const override;
 
 private:

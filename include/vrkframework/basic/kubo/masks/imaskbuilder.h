@@ -18,10 +18,16 @@ public:
 
 protected:
     IMaskBuilder() = default;
+
+    /// @name Copying
+    ///@{
+
+    /// Only implementations copy; the interface holds no data.
     IMaskBuilder(const IMaskBuilder&) = default;
     IMaskBuilder& operator=(const IMaskBuilder&) = default;
     IMaskBuilder(IMaskBuilder&&) = default;
     IMaskBuilder& operator=(IMaskBuilder&&) = default;
+    ///@}
 };
 
 }  // namespace kora::kubo

@@ -26,10 +26,16 @@ public:
 
 protected:
     IMaskDecision() = default;
+
+    /// @name Copying
+    ///@{
+
+    /// Only implementations copy; the interface holds no data.
     IMaskDecision(const IMaskDecision&) = default;
     IMaskDecision& operator=(const IMaskDecision&) = default;
     IMaskDecision(IMaskDecision&&) = default;
     IMaskDecision& operator=(IMaskDecision&&) = default;
+    ///@}
 };
 
 }  // namespace kora::kubo

@@ -24,10 +24,16 @@ public:
 
 protected:
     IMaskDecisionImpl() = default;
+
+    /// @name Copying
+    ///@{
+
+    /// Only implementations copy; the interface holds no data.
     IMaskDecisionImpl(const IMaskDecisionImpl&) = default;
     IMaskDecisionImpl& operator=(const IMaskDecisionImpl&) = default;
     IMaskDecisionImpl(IMaskDecisionImpl&&) = default;
     IMaskDecisionImpl& operator=(IMaskDecisionImpl&&) = default;
+    ///@}
 };
 
 /// Builds the kernel for samples of `type` with `channelCount` channels under `rule`;

@@ -20,17 +20,29 @@ namespace kora::kubo {
 class KUBO_API Mask : public RasterInfo, public RasterContext {
 public:
     /// Every pixel background.
+    /// @throws kora::OutOfBoundsException "A mask of W x H pixels (margins included)
+    ///   exceeds the 4294967295 bits a mask holds", values {W, H} saturated to INT_MAX, when
+    ///   the full width or height passes INT_MAX or their product 4294967295.
     Mask(const RasterInfo& info, const RasterContext& context);
     /// Takes the bits from `buffer`: when `packed` is false it holds one flag byte per
     /// pixel (bit = flag != 0), else the packed bytes, of which the first byte count are
     /// copied as they are. When `freeBuffer` is set the buffer, allocated with
-    /// `new unsigned char[]`, is released with `delete[]` before the constructor returns.
+    /// `new unsigned char[]`, is released with `delete[]` before the constructor returns,
+    /// also when it throws. A null buffer leaves every pixel background.
+    /// @throws kora::OutOfBoundsException as Mask(info, context) does.
     Mask(const RasterInfo& info, const RasterContext& context, unsigned char* buffer,
          bool freeBuffer, bool packed);
+
+    /// @name Copying
+    ///@{
+
+    /// Copies the description and the bits; moving takes the bits over.
     Mask(const Mask&) = default;
     Mask& operator=(const Mask&) = default;
     Mask(Mask&&) = default;
     Mask& operator=(Mask&&) = default;
+    ///@}
+
     ~Mask() override;
 
     /// width + 2 x xMargin.

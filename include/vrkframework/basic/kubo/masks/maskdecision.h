@@ -28,11 +28,19 @@ public:
     /// `noData[i]` is the value of channel `channels[i]` (counted from 1). Makes no kernel.
     MaskDecision(BkgdRule rule, std::vector<double> noData, std::vector<unsigned int> channels,
                  bool expanded);
-    /// Copies every field and a clone of the kernel.
+
+    /// @name Copying
+    ///@{
+
+    /// A copy holds every field and a clone of the kernel. Assignment builds the copy before
+    /// it replaces anything. Moving takes the kernel and the lists over and leaves `other`
+    /// fit only to be assigned to or destroyed.
     MaskDecision(const MaskDecision& other);
     MaskDecision& operator=(const MaskDecision& other);
     MaskDecision(MaskDecision&&) noexcept;
     MaskDecision& operator=(MaskDecision&&) noexcept;
+    ///@}
+
     ~MaskDecision() override;
 
     /// Binds to the raster description: widens the lists on the first call unless they are
@@ -61,9 +69,13 @@ public:
 
     /// The current kernel, or null before the first binding or when none exists.
     const IMaskDecisionImpl* GetImpl() const { return m_impl.get(); }
+    /// The rule.
     BkgdRule GetRule() const { return m_rule; }
+    /// True once the lists are final: one no-data value per tested channel.
     bool IsExpanded() const { return m_expanded; }
+    /// The no-data values; entry i belongs to channel GetChannels()[i].
     const std::vector<double>& GetNoData() const { return m_noData; }
+    /// The tested channels, counted from 1.
     const std::vector<unsigned int>& GetChannels() const { return m_channels; }
 
 private:

@@ -34,14 +34,23 @@ public:
     /// Uses a clone of `decision` (not taken over; null gives masks with every pixel
     /// background).
     explicit MaskDecisionBuilder(const IMaskDecision* decision);
+
+    /// @name Copying
+    ///@{
+
+    /// Copies share the decision; the last holder releases it. Moving hands the share
+    /// over and leaves `other` without a decision (its masks are all background).
     MaskDecisionBuilder(const MaskDecisionBuilder&) = default;
     MaskDecisionBuilder& operator=(const MaskDecisionBuilder&) = default;
     MaskDecisionBuilder(MaskDecisionBuilder&&) = default;
     MaskDecisionBuilder& operator=(MaskDecisionBuilder&&) = default;
+    ///@}
+
     ~MaskDecisionBuilder() override;
 
     /// A new mask of the raster's full extent (the caller deletes it), or null when the
     /// memory for it cannot be had.
+    /// @throws kora::OutOfBoundsException as the Mask constructor does, before any work.
     Mask* BuildMask(const Raster& raster) const override;
 
     /// The decision the builder and its copies share.

@@ -33,16 +33,25 @@ public:
     /// buffer is not kept.
     /// @throws kora::DataException when `buffer` is null.
     BitwiseRLECompressedData(unsigned char* buffer, RasterInfo& info);
+
+    /// @name Copying
+    ///@{
+
+    /// Copies share the runs; the last holder releases them. A copy takes the source's
+    /// description and cursor position, and the two cursors move on apart. Moving copies,
+    /// so the source stays usable.
     BitwiseRLECompressedData(const BitwiseRLECompressedData& other);
     BitwiseRLECompressedData& operator=(const BitwiseRLECompressedData& other);
     BitwiseRLECompressedData(BitwiseRLECompressedData&& other) noexcept;
     BitwiseRLECompressedData& operator=(BitwiseRLECompressedData&& other) noexcept;
+    ///@}
+
     ~BitwiseRLECompressedData() override;
 
-    unsigned int GetWidth() const { return m_info.width; }
-    unsigned int GetHeight() const { return m_info.height; }
-    unsigned int GetChansCount() const { return m_info.channels; }
-    const DataType& GetDataType() const { return m_info.dataType; }
+    unsigned int GetWidth() const { return m_info.width; }           ///< pixels per line
+    unsigned int GetHeight() const { return m_info.height; }         ///< number of lines
+    unsigned int GetChansCount() const { return m_info.channels; }   ///< samples per pixel
+    const DataType& GetDataType() const { return m_info.dataType; }  ///< type of one sample
     /// The runs; valid as long as one copy of this object lives.
     const unsigned char* GetCompressedData() const { return m_buffer.get(); }
     /// Number of runs (bytes).

@@ -54,7 +54,10 @@ public:
     ComplexInterpretation(const ComplexInterpretation& other);
     /// Shares `other`'s worker; the worker held before goes once its last holder does.
     ComplexInterpretation& operator=(const ComplexInterpretation& other);
+    /// Takes over `other`'s worker; `other` is left without one.
     ComplexInterpretation(ComplexInterpretation&& other) noexcept;
+    /// Takes over `other`'s worker, `other` is left without one; the worker held before
+    /// goes once its last holder does.
     ComplexInterpretation& operator=(ComplexInterpretation&& other) noexcept;
     ~ComplexInterpretation() override;
 

@@ -7,18 +7,20 @@
 #include "vrkframework/basic/kubo/kuboapi.h"
 #include "vrkframework/platform/buffertype.h"
 
+/// The raster library: sample descriptors, rasters and their margins, conversions, masks,
+/// compressed rasters, lookup tables and control points.
 namespace kora::kubo {
 
 /// Describes one sample: its width, signedness, floating layout and whether it is a
 /// (real, imaginary) pair. For a complex type every field describes one component.
 /// Integer descriptors whose `bits` is not a multiple of 8 describe packed samples.
 struct KUBO_API DataType {
-    unsigned int bits;
-    bool isSigned;
-    bool isFloat;
-    unsigned int mantissaBits;
-    unsigned int exponentBits;
-    bool isComplex;
+    unsigned int bits;          ///< bits of one sample, of one component if complex (C32R: 32)
+    bool isSigned;              ///< values can be negative; set for every floating type
+    bool isFloat;               ///< IEEE floating point
+    unsigned int mantissaBits;  ///< `bits` for integers, 23 for 32-bit and 52 for 64-bit floats
+    unsigned int exponentBits;  ///< 0 for integers, 8 for 32-bit and 11 for 64-bit floats
+    bool isComplex;             ///< each sample is a (real, imaginary) pair of components
 
     /// All fields zero: equal to no predefined type.
     constexpr DataType()
@@ -29,6 +31,7 @@ struct KUBO_API DataType {
           exponentBits(0),
           isComplex(false) {}
 
+    /// Takes the six fields in declaration order; any combination is accepted.
     constexpr DataType(unsigned int bitCount, bool signedType, bool floatType,
                        unsigned int mantissaBitCount, unsigned int exponentBitCount,
                        bool complexType)
@@ -45,8 +48,15 @@ struct KUBO_API DataType {
                mantissaBits == other.mantissaBits && exponentBits == other.exponentBits &&
                isComplex == other.isComplex;
     }
+    /// True when any of the six fields differs.
     constexpr bool operator!=(const DataType& other) const { return !(*this == other); }
 
+    /// @name Predefined types
+    ///@{
+
+    /// A predefined type. The name after Type is its label: the bits of one component,
+    /// then U (unsigned), S (signed) or R (floating), with a C in front for complex types
+    /// (TypeC32R holds two floats). Type1U is the type of bit masks.
     static const DataType Type1U;
     static const DataType Type8U;
     static const DataType Type8S;
@@ -68,6 +78,7 @@ struct KUBO_API DataType {
     static const DataType TypeC64U;
     static const DataType TypeC64S;
     static const DataType TypeC64R;
+    ///@}
 };
 
 // Constant-initialised, so other static initialisers and constant expressions may use them.

@@ -14,16 +14,25 @@ public:
     virtual ~IDataTypeConstraints();
     /// True when the natural range of `type` is not contained in this range.
     virtual bool IsBounded(const DataType& type) const = 0;
+    /// Lower bound of the range.
     virtual double GetMin() const = 0;
+    /// Upper bound of the range.
     virtual double GetMax() const = 0;
+    /// Resolution: the step between neighbouring values.
     virtual double GetEpsilon() const = 0;
 
 protected:
     IDataTypeConstraints() = default;
+
+    /// @name Copying
+    ///@{
+
+    /// Only implementations copy; the interface holds no data.
     IDataTypeConstraints(const IDataTypeConstraints&) = default;
     IDataTypeConstraints& operator=(const IDataTypeConstraints&) = default;
     IDataTypeConstraints(IDataTypeConstraints&&) = default;
     IDataTypeConstraints& operator=(IDataTypeConstraints&&) = default;
+    ///@}
 };
 
 /// A stored range: either given, or the natural range of a type (of one component for
@@ -32,14 +41,22 @@ class KUBO_API DataTypeConstraints : public IDataTypeConstraints {
 public:
     /// min = max = epsilon = 0.
     DataTypeConstraints();
+    /// Stores the three values as given; they are not checked.
     DataTypeConstraints(double min, double max, double epsilon);
     /// Natural range: [0, 2^n - 1] step 1 for unsigned, the float or double range for
     /// floating types, [-2^(n-1), 2^(n-1) - 1] step 1 for signed integers.
     explicit DataTypeConstraints(const DataType& type);
+
+    /// @name Copying
+    ///@{
+
+    /// Copies min, max and epsilon.
     DataTypeConstraints(const DataTypeConstraints& other);
     DataTypeConstraints& operator=(const DataTypeConstraints& other);
     DataTypeConstraints(DataTypeConstraints&&) = default;
     DataTypeConstraints& operator=(DataTypeConstraints&&) = default;
+    ///@}
+
     /// Takes min, max and epsilon through the other range's getters, in that order.
     DataTypeConstraints& operator=(const IDataTypeConstraints& other);
     ~DataTypeConstraints() override;

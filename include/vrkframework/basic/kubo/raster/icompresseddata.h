@@ -25,10 +25,16 @@ public:
 
 protected:
     ICompressedData() = default;
+
+    /// @name Copying
+    ///@{
+
+    /// Copies the inherited RasterInfo part; only implementations copy.
     ICompressedData(const ICompressedData&) = default;
     ICompressedData& operator=(const ICompressedData&) = default;
     ICompressedData(ICompressedData&&) = default;
     ICompressedData& operator=(ICompressedData&&) = default;
+    ///@}
 };
 
 }  // namespace kora::kubo

@@ -22,10 +22,16 @@ public:
 
 protected:
     IPromoteFactory() = default;
+
+    /// @name Copying
+    ///@{
+
+    /// Only implementations copy; the interface holds no data.
     IPromoteFactory(const IPromoteFactory&) = default;
     IPromoteFactory& operator=(const IPromoteFactory&) = default;
     IPromoteFactory(IPromoteFactory&&) = default;
     IPromoteFactory& operator=(IPromoteFactory&&) = default;
+    ///@}
 };
 
 }  // namespace kora::kubo

@@ -22,10 +22,16 @@ public:
 
 protected:
     IRasterInterpretation() = default;
+
+    /// @name Copying
+    ///@{
+
+    /// Only implementations copy; the interface holds no data.
     IRasterInterpretation(const IRasterInterpretation&) = default;
     IRasterInterpretation& operator=(const IRasterInterpretation&) = default;
     IRasterInterpretation(IRasterInterpretation&&) = default;
     IRasterInterpretation& operator=(IRasterInterpretation&&) = default;
+    ///@}
 };
 
 }  // namespace kora::kubo

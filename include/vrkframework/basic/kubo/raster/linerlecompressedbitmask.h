@@ -29,19 +29,31 @@ class KUBO_API LineRLECompressedBitMask : public ICompressedData {
 public:
     /// Compresses the visible area of `raster`: row r is read from the address of its
     /// visible pixel (0, r), one byte per pixel.
+    /// @throws kora::DataException "The raster buffer does not hold one byte per pixel of
+    ///   every row to compress" when the raster has no buffer, or too few bytes to read
+    ///   every visible row from; nothing is read then.
     explicit LineRLECompressedBitMask(Raster& raster);
     /// A mask of `width` x `height` whose rows are still empty; fill them with CompressRow.
     LineRLECompressedBitMask(unsigned int width, unsigned int height);
+
+    /// @name Copying
+    ///@{
+
+    /// Copies share the row table: a row replaced through one copy is seen by all. The last
+    /// holder releases the rows; a copy takes the source's description. Moving copies, so
+    /// the source stays usable.
     LineRLECompressedBitMask(const LineRLECompressedBitMask& other);
     LineRLECompressedBitMask& operator=(const LineRLECompressedBitMask& other);
     LineRLECompressedBitMask(LineRLECompressedBitMask&& other) noexcept;
     LineRLECompressedBitMask& operator=(LineRLECompressedBitMask&& other) noexcept;
+    ///@}
+
     ~LineRLECompressedBitMask() override;
 
-    unsigned int GetWidth() const { return m_info.width; }
-    unsigned int GetHeight() const { return m_info.height; }
-    unsigned int GetChansCount() const { return m_info.channels; }
-    const DataType& GetDataType() const { return m_info.dataType; }
+    unsigned int GetWidth() const { return m_info.width; }           ///< pixels per row
+    unsigned int GetHeight() const { return m_info.height; }         ///< number of rows
+    unsigned int GetChansCount() const { return m_info.channels; }   ///< 1
+    const DataType& GetDataType() const { return m_info.dataType; }  ///< DataType::Type1U
     /// (bits + 7) / 8 of the 1-bit type: 1.
     std::uint64_t GetBytesPerPixel() const;
     /// Bytes of one decoded row: bytes-per-pixel x channels x width.

@@ -9,6 +9,7 @@ namespace kora::kubo {
 
 class RasterInfo;
 
+/// The library's code of a sample type; NDT_UNKNOWN for types without one.
 enum NativeDataTypeCode {
     NDT_8U = 0,
     NDT_8S = 1,
@@ -32,14 +33,22 @@ enum NativeDataTypeCode {
 /// 8-bit complex types fold onto the real 8-bit codes; C32U and the 64-bit complex
 /// integers have no code.
 struct KUBO_API NativeDataType : public DataType {
+    /// Copies `type` and computes its code.
     NativeDataType(const DataType& type);  // NOLINT(google-explicit-constructor): a widening
+
+    /// @name Copying
+    ///@{
+
+    /// Copies the descriptor and its code.
     NativeDataType(const NativeDataType&) = default;
     NativeDataType& operator=(const NativeDataType&) = default;
     NativeDataType(NativeDataType&&) = default;
     NativeDataType& operator=(NativeDataType&&) = default;
+    ///@}
+
     virtual ~NativeDataType();
 
-    NativeDataTypeCode code;
+    NativeDataTypeCode code;  ///< the code of the descriptor, as computed on construction
 };
 
 /// The native code of a raster's sample type.

@@ -37,10 +37,17 @@ public:
     class InnerFactory;
 
     PromoteFactory();
+
+    /// @name Copying
+    ///@{
+
+    /// Factories hold no data: any copy is interchangeable with its source.
     PromoteFactory(const PromoteFactory& other);
     PromoteFactory& operator=(const PromoteFactory& other);
     PromoteFactory(PromoteFactory&&) = default;
     PromoteFactory& operator=(PromoteFactory&&) = default;
+    ///@}
+
     ~PromoteFactory() override;
 
     /// Null when `from` equals `to`. Otherwise the family chosen by the complex flags

@@ -23,11 +23,24 @@ public:
     Raster();
     /// Allocates an uninitialised buffer of ((bits + 7) / 8) x (2 if complex) x
     /// bufferHeight x lineStride x channels bytes and owns it.
+    /// @throws kora::OutOfBoundsException "A raster of W x H pixels (margins included)
+    ///   exceeds 4294967295 pixels a side" (or "... exceeds 2^64 bytes"), values {W, H}
+    ///   saturated to INT_MAX, before anything is allocated.
     Raster(const RasterInfo& info, const RasterContext& context);
+
+    /// @name Copying
+    ///@{
+
+    /// Copying and moving; no buffer is ever freed twice. A copy of an owning raster owns a
+    /// new copy of the buffer (assignment allocates it before releasing its own); a copy of
+    /// a wrapping raster wraps the same buffer. Moving hands the buffer and its ownership
+    /// over and leaves the source's `data` null and `ownsData` false.
     Raster(const Raster& other);
     Raster& operator=(const Raster& other);
     Raster(Raster&& other) noexcept;
     Raster& operator=(Raster&& other) noexcept;
+    ///@}
+
     ~Raster() override;
 
     unsigned int lineStride;    ///< pixels per buffer line: width + 2 x xMargin

@@ -8,7 +8,9 @@ namespace kora::kubo {
 /// first pixel in the coordinate frame of the whole source image.
 class RasterContext {
 public:
+    /// No margins, at the origin.
     constexpr RasterContext() : xMargin(0), yMargin(0), xOffset(0), yOffset(0) {}
+    /// Takes the four fields in declaration order.
     constexpr RasterContext(unsigned int xMargin_, unsigned int yMargin_, unsigned int xOffset_,
                             unsigned int yOffset_)
         : xMargin(xMargin_), yMargin(yMargin_), xOffset(xOffset_), yOffset(yOffset_) {}

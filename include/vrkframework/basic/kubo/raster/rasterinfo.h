@@ -16,15 +16,23 @@ class KUBO_API RasterInfo {
 public:
     /// Every field zero, the data type included.
     RasterInfo() : width(0), height(0), channels(0) {}
+    /// Takes the four fields in declaration order.
     RasterInfo(unsigned int width_, unsigned int height_, unsigned int channels_,
                const DataType& dataType_)
         : width(width_), height(height_), channels(channels_), dataType(dataType_) {}
     /// Asks the reader for its width, height, channel count and data type, in that order.
     RasterInfo(const kora::datasources::IRasterReader& reader);  // NOLINT: a description of it
+
+    /// @name Copying
+    ///@{
+
+    /// Copies the four fields.
     RasterInfo(const RasterInfo&) = default;
     RasterInfo& operator=(const RasterInfo&) = default;
     RasterInfo(RasterInfo&&) = default;
     RasterInfo& operator=(RasterInfo&&) = default;
+    ///@}
+
     virtual ~RasterInfo();
 
     unsigned int width;     ///< pixels per line of the image proper

@@ -31,18 +31,26 @@ public:
     /// an empty stream and reads nothing.
     /// @throws kora::DataException when `buffer` is null.
     RLECompressedData(unsigned char* buffer, RasterInfo& info, RasterContext& context);
+
+    /// @name Copying
+    ///@{
+
+    /// Copies share the pairs; the last holder releases them. A copy takes the source's
+    /// description. Moving copies, so the source stays usable.
     RLECompressedData(const RLECompressedData& other);
     RLECompressedData& operator=(const RLECompressedData& other);
     RLECompressedData(RLECompressedData&& other) noexcept;
     RLECompressedData& operator=(RLECompressedData&& other) noexcept;
+    ///@}
+
     ~RLECompressedData() override;
 
     /// Width of the raster as compressed: margins included.
     unsigned int GetWidth() const { return m_info.width; }
     /// Height of the raster as compressed: margins included.
     unsigned int GetHeight() const { return m_info.height; }
-    unsigned int GetChansCount() const { return m_info.channels; }
-    const DataType& GetDataType() const { return m_info.dataType; }
+    unsigned int GetChansCount() const { return m_info.channels; }   ///< samples per pixel
+    const DataType& GetDataType() const { return m_info.dataType; }  ///< type of one sample
     /// The pairs; valid as long as one copy of this object lives.
     const unsigned char* GetCompressedData() const { return m_buffer.get(); }
     /// Bytes of pairs (always even).

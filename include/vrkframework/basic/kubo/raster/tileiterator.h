@@ -10,10 +10,10 @@ namespace kora::kubo {
 
 /// One rectangle of a cut; all zero stands for "no tile".
 struct Tile {
-    unsigned int xOffset;
-    unsigned int yOffset;
-    unsigned int xSize;
-    unsigned int ySize;
+    unsigned int xOffset;  ///< column of the tile's upper-left pixel
+    unsigned int yOffset;  ///< line of the tile's upper-left pixel
+    unsigned int xSize;    ///< width in pixels
+    unsigned int ySize;    ///< height in lines
 };
 
 /// Cuts the area [xStart, xEnd) x [yStart, yEnd) into tiles, left to right within a row
@@ -26,6 +26,8 @@ public:
     TileIterator(unsigned int xSize, unsigned int ySize);
     /// Area from (xOffset, yOffset); tiles of xSize / 4 by ySize / 4.
     /// @throws kora::DataException "Invalid windows size" when a size is 0.
+    /// @throws kora::OutOfBoundsException "An area of S pixels from O ends past 4294967295",
+    ///   values {O, S}, when the area ends past 4294967295 in either direction.
     TileIterator(unsigned int xOffset, unsigned int yOffset, unsigned int xSize,
                  unsigned int ySize);
 
@@ -46,6 +48,7 @@ public:
     Tile GetTile(unsigned int index);
     /// Moves the walk to `index` unless the walk is already done (index is not checked).
     void SetCurrentTile(unsigned int index);
+    /// True once the walk has passed the last tile (at once for an empty cut).
     bool IsDone() const;
     /// Index of the first tile containing (x, y), or the tile count when none does.
     unsigned int GetTileIndex(unsigned int x, unsigned int y) const;
@@ -55,15 +58,17 @@ public:
     bool Check(unsigned int width, unsigned int height) const;
 
 protected:
-    /// The cut behind every sizing operation; returns the number of tiles.
+    /// The cut behind every sizing operation; returns the number of tiles and rewinds.
+    /// @throws kora::OutOfBoundsException "A cut into N tiles exceeds 4294967295 tiles"
+    ///   before cutting; the previous cut stays.
     unsigned int Cuthem(unsigned int tileXSize, unsigned int tileYSize);
 
-    unsigned int xEnd;
-    unsigned int yEnd;
-    unsigned int xStart;
-    unsigned int yStart;
-    std::vector<Tile> tiles;
-    unsigned int current;
+    unsigned int xEnd;        ///< one past the area's last column
+    unsigned int yEnd;        ///< one past the area's last line
+    unsigned int xStart;      ///< the area's first column
+    unsigned int yStart;      ///< the area's first line
+    std::vector<Tile> tiles;  ///< the cut, row-major
+    unsigned int current;     ///< index of the tile GetNextTile returns next
 };
 
 }  // namespace kora::kubo
