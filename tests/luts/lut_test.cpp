@@ -139,4 +139,12 @@ TEST(LUT, ThrowsOnA256ByteVectorOfAnotherSizeOrFewerThanTwoEntries) {
     }
 }
 
+TEST(LUT, ATableFromANullBytePointerIsRefused) {
+    const auto lut = kubo_test::Catch<kora::DataException>(
+        [] { LUT(static_cast<const unsigned char*>(nullptr)); });
+    ASSERT_TRUE(lut);
+    kubo_test::ExpectReport(*lut, "The table bytes are NULL.", kSource,
+                            "__cdecl kora::kubo::LUT::LUT(const unsigned char *)", 0);
+}
+
 }  // namespace

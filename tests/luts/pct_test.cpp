@@ -108,4 +108,12 @@ TEST(PCT, ThrowsOnAColourVectorOfAnotherSizeOrFewerThanTwoEntries) {
         80);
 }
 
+TEST(PCT, ATableFromANullBytePointerIsRefused) {
+    const auto failure = kubo_test::Catch<kora::DataException>(
+        [] { PCT(static_cast<const unsigned char*>(nullptr)); });
+    ASSERT_TRUE(failure);
+    kubo_test::ExpectReport(*failure, "The table bytes are NULL.", kSource,
+                            "__cdecl kora::kubo::PCT::PCT(const unsigned char *)", 0);
+}
+
 }  // namespace

@@ -6,13 +6,17 @@
 
 #include <cmath>
 #include <cstdint>
+#include <functional>
 #include <limits>
 #include <memory>
 #include <numeric>
 #include <string>
 #include <vector>
 
+#include "support/expectfailure.h"
 #include "vrkframework/basic/core/typeconv/typelist.h"
+#include "vrkframework/basic/kubo/masks/maskdecision.h"
+#include "vrkframework/basic/kubo/raster/raster.h"
 
 namespace {
 
@@ -297,6 +301,34 @@ TEST(GetMaskDecisionImpl, FlagsTheEdgeCases) {
             ADD_FAILURE() << "no kernel for case " << &c - cases;
         }
     }
+}
+
+// Kernels and decisions refuse null sample or flag buffers when there are pixels to flag.
+TEST(NoDataKernels, NullBuffersAreRefusedWhenThereArePixels) {
+    const Kernel single(GetMaskDecisionImpl(DataType::Type8U, 1, BkgdAnyChan, {0}, {1}));
+    const Kernel dummy(GetMaskDecisionImpl(DataType::Type8U, 3, BkgdAnyChan, {}, {}));
+    MaskDecision decision(BkgdAnyChan, {0}, {}, false);
+    const unsigned char samples[3] = {};
+    unsigned char flags[3];
+    const std::function<void()> calls[] = {
+        [&] { single->Evaluate(nullptr, flags, 3); },
+        [&] { single->Evaluate(samples, nullptr, 3); },
+        [&] { dummy->Evaluate(samples, nullptr, 3); },
+        [&] {
+            decision.Evaluate(Raster(RasterInfo(3, 1, 1, DataType::Type8U), RasterContext()),
+                              nullptr);
+        },
+    };
+    for (const auto& call : calls) {
+        const auto failure = kubo_test::Catch<kora::DataException>(call);
+        ASSERT_TRUE(failure.has_value());
+        kubo_test::ExpectReport(*failure, "A sample or flag buffer is NULL.",
+                                "vrkframework/basic/kubo/masks/nodatamaskimpl",
+                                "void __cdecl kora::kubo::IMaskDecisionImpl::Evaluate(const void "
+                                "*,unsigned char *,unsigned __int64)",
+                                0);
+    }
+    single->Evaluate(nullptr, nullptr, 0);
 }
 
 }  // namespace

@@ -8,6 +8,7 @@
 #include "support/compressedsamples.h"
 #include "support/expectfailure.h"
 #include "vrkframework/basic/kubo/raster/bitwiserlecompresseddata.h"
+#include "vrkframework/basic/kubo/raster/count32.h"
 #include "vrkframework/basic/kubo/raster/linerlecompressedbitmask.h"
 #include "vrkframework/basic/kubo/raster/rlecompresseddata.h"
 
@@ -157,6 +158,19 @@ TYPED_TEST(CompressedRaster, NullOutputBuffersAreRejected) {
     kubo_test::ExpectReport(*window, T::kWindowMessage, T::kSource,
                             (prefix + "int,int,int,int,unsigned char *) const").c_str(),
                             T::kWindowLine);
+}
+
+// Sizes past what the 32-bit accessors return are refused rather than truncated (the
+// streams of a raster large enough for that are tested by size in kubo_large).
+TEST(CompressedSizes, CountsPast32BitsAreRefused) {
+    EXPECT_EQ(kora::kubo::detail::Count32(4294967295u, "A size", "source", "function"),
+              4294967295u);
+    const auto failure = kubo_test::Catch<kora::OutOfBoundsException>([] {
+        kora::kubo::detail::Count32(4294967296u, "A compressed size", "source", "function");
+    });
+    ASSERT_TRUE(failure.has_value());
+    kubo_test::ExpectReport(*failure, "A compressed size of 4294967296 exceeds 4294967295",
+                            "source", "function", 0);
 }
 
 }  // namespace

@@ -9,18 +9,22 @@
 #include <cstdio>
 #include <cstring>
 #include <functional>
+#include <initializer_list>
 #include <limits>
 #include <memory>
 #include <ostream>
 #include <random>
 #include <string>
 #include <type_traits>
+#include <utility>
 #include <vector>
 
+#include "support/expectfailure.h"
 #include "support/promotereference.h"
 #include "vrkframework/basic/core/typeconv/complex2realpromote.h"
 #include "vrkframework/basic/core/typeconv/complexpromote.h"
 #include "vrkframework/basic/core/typeconv/kernels.h"
+#include "vrkframework/basic/core/typeconv/packedpromote.h"
 #include "vrkframework/basic/core/typeconv/real2complexpromote.h"
 
 namespace {
@@ -357,6 +361,29 @@ TEST(Promote, NaNAndInfinities) {
         Converted<float>(typeconv::Promote<double, float>(), std::vector<double>{1e300, -1e300}, 2);
     EXPECT_EQ(overflow[0], std::numeric_limits<float>::infinity());
     EXPECT_EQ(overflow[1], -std::numeric_limits<float>::infinity());
+}
+
+// A null source or destination is refused when there are samples to convert, in every
+// family and in the packed converters; with none, nothing is touched.
+TEST(Promote, NullBuffersAreRefusedWhenThereAreSamples) {
+    typeconv::Promote<short, float> real;
+    typeconv::ComplexPromote<float, int> complex;
+    typeconv::SpecialPromote<12, short, 0> unpack;
+    float buffer[4] = {};
+    for (typeconv::IPromote* promote :
+         std::initializer_list<typeconv::IPromote*>{&real, &complex, &unpack}) {
+        for (const auto& [src, dst] : {std::pair<const void*, void*>{nullptr, buffer},
+                                       std::pair<const void*, void*>{buffer, nullptr}}) {
+            const auto failure =
+                kubo_test::Catch<kora::DataException>([&] { promote->Promote(src, dst, 1); });
+            ASSERT_TRUE(failure.has_value());
+            kubo_test::ExpectReport(
+                *failure, "A conversion buffer is NULL.",
+                "vrkframework/basic/core/typeconv/promote",
+                "void __cdecl typeconv::IPromote::Promote(const void *,void *,unsigned int)", 0);
+            promote->Promote(src, dst, 0);
+        }
+    }
 }
 
 }  // namespace

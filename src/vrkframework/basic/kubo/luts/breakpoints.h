@@ -8,6 +8,8 @@
 #include <cstddef>    // std::size_t
 #include <vector>
 
+#include "vrkframework/platform/exception.h"
+
 namespace kora::kubo::detail {
 
 /// Breakpoints of a classic 8-bit table, whose inputs are 0 to 255.
@@ -21,6 +23,16 @@ std::vector<Entry> ClassicEntries(const Source* values) {
         entries[i] = {static_cast<double>(i), values[i]};
     }
     return entries;
+}
+
+/// `bytes`, the 256 (or 3 x 256) bytes a classic table is read from.
+/// @throws kora::DataException "The table bytes are NULL." when there are none.
+inline const unsigned char* CheckedTableBytes(const unsigned char* bytes, const char* sourcePath,
+                                              const char* function) {
+    if (bytes == nullptr) {
+        throw kora::DataException("The table bytes are NULL.", sourcePath, function, 0);
+    }
+    return bytes;
 }
 
 /// Sorts (input, value) entries by input unless no neighbour pair is out of order.

@@ -50,7 +50,9 @@ LUT::LUT(const std::vector<Entry>& entries) : BreakpointTable(entries) {
     detail::SortByInput(m_entries);
 }
 
-LUT::LUT(const unsigned char* values) : BreakpointTable(detail::ClassicEntries<Entry>(values)) {}
+LUT::LUT(const unsigned char* values)
+    : BreakpointTable(detail::ClassicEntries<Entry>(detail::CheckedTableBytes(
+          values, kSourcePath, "__cdecl kora::kubo::LUT::LUT(const unsigned char *)"))) {}
 
 double LUT::GetSearchedValue(double x) const {
     const detail::Bracket at = detail::Search(m_entries, x);

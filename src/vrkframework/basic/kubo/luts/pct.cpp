@@ -82,7 +82,11 @@ PCT::PCT(const std::vector<Entry>& entries) : BreakpointTable(entries) {
 }
 
 PCT::PCT(const unsigned char* planes)
-    : BreakpointTable(detail::ClassicEntries<Entry>(InterleavePlanes(planes).data())) {}
+    : BreakpointTable(detail::ClassicEntries<Entry>(
+          InterleavePlanes(
+              detail::CheckedTableBytes(planes, kSourcePath,
+                                        "__cdecl kora::kubo::PCT::PCT(const unsigned char *)"))
+              .data())) {}
 
 std::uint32_t PCT::GetSearchedColour(double x) const {
     const detail::Bracket at = detail::Search(m_entries, x);
