@@ -1,4 +1,4 @@
-"""The session in python/README.md runs as it is written."""
+"""The Python session in the README runs as it is written."""
 
 from __future__ import annotations
 
@@ -7,7 +7,7 @@ import re
 
 import numpy as np
 
-README = pathlib.Path(__file__).resolve().parents[1] / "README.md"
+README = pathlib.Path(__file__).resolve().parents[2] / "README.md"
 
 
 def test_the_readme_session_runs_word_for_word():
