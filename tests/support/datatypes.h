@@ -1,10 +1,14 @@
-// The predefined sample descriptors, and the component type of an index chosen at run
-// time, for the tests and fuzz targets that sweep sample types.
+// The predefined sample descriptors and the component types, walked at compile time or
+// chosen at run time, for the tests and fuzz targets that sweep sample types.
 #ifndef KUBO_TESTS_SUPPORT_DATATYPES_H
 #define KUBO_TESTS_SUPPORT_DATATYPES_H
 
-#include <cstdint>  // std::int64_t, std::uint64_t
+#include <cstddef>  // std::size_t
+#include <string>
+#include <type_traits>
+#include <utility>  // std::index_sequence
 
+#include "vrkframework/basic/core/typeconv/componenttraits.h"
 #include "vrkframework/basic/kubo/raster/datatype.h"
 
 namespace kubo_test {
@@ -25,33 +29,36 @@ struct Tag {
     using type = T;
 };
 
-/// Calls f(Tag<T>{}) for the component type T at `index` in dispatch order (signed 8-bit,
-/// unsigned 8-bit, 16-bit, 32-bit, float, double, 64-bit); does nothing for other indexes.
+template <class F, std::size_t... Index>
+void ForEachComponentTypeIn(const F& f, std::index_sequence<Index...>) {
+    (f(Tag<typeconv::detail::ComponentAt<Index>>{}), ...);
+}
+
+/// Calls f(Tag<T>{}) for every component type T, in dispatch order.
+template <class F>
+void ForEachComponentType(const F& f) {
+    ForEachComponentTypeIn(f, std::make_index_sequence<typeconv::detail::kComponentCount>());
+}
+
+/// Calls f(Tag<T>{}) for the component type T at `index` in dispatch order; does nothing
+/// for other indexes.
 template <class F>
 void WithComponent(int index, const F& f) {
-    switch (index) {
-        case 0:
-            return f(Tag<char>{});
-        case 1:
-            return f(Tag<unsigned char>{});
-        case 2:
-            return f(Tag<short>{});
-        case 3:
-            return f(Tag<unsigned short>{});
-        case 4:
-            return f(Tag<int>{});
-        case 5:
-            return f(Tag<unsigned int>{});
-        case 6:
-            return f(Tag<float>{});
-        case 7:
-            return f(Tag<double>{});
-        case 8:
-            return f(Tag<std::int64_t>{});
-        case 9:
-            return f(Tag<std::uint64_t>{});
-        default:
-            break;
+    int at = 0;
+    ForEachComponentType([&](auto tag) {
+        if (at++ == index) {
+            f(tag);
+        }
+    });
+}
+
+/// A component type's name in test names: Int16, UInt8, Float32, ...
+template <class T>
+std::string TypeName() {
+    if constexpr (std::is_floating_point_v<T>) {
+        return sizeof(T) == 4 ? "Float32" : "Float64";
+    } else {
+        return std::string(std::is_signed_v<T> ? "Int" : "UInt") + std::to_string(sizeof(T) * 8);
     }
 }
 

@@ -12,9 +12,11 @@
 #include <type_traits>
 #include <vector>
 
+#include "support/datatypes.h"
 #include "support/expectfailure.h"
+#include "support/kernelvariants.h"
 #include "support/promotereference.h"
-#include "vrkframework/basic/core/typeconv/kernels.h"
+#include "vrkframework/basic/core/typeconv/conversionkernels.h"
 #include "vrkframework/basic/core/typeconv/packedpromote.h"
 #include "vrkframework/basic/kubo/raster/datatype.h"
 #include "vrkframework/basic/kubo/raster/promotefactory.h"
@@ -23,8 +25,6 @@ namespace {
 
 using kora::kubo::DataType;
 using kubo_test::StreamBytes;
-using typeconv::detail::KernelSet;
-using typeconv::detail::KernelVariant;
 
 const unsigned int kBitCounts[] = {1,  2,  3,  4,  5,  6,  7,  9,  10, 11, 12, 13, 14, 15, 17,
                                    18, 19, 20, 21, 22, 23, 24, 25, 26, 27, 28, 29, 30, 31};
@@ -82,14 +82,9 @@ void CheckUnpack(const std::vector<unsigned char>& stream, std::size_t count, un
         << where;
 }
 
+// Every bit count that fits T, through the converters and the kernels of the variant in use.
 template <class T>
-class BitDepth : public testing::Test {};
-using ElementTypes = testing::Types<char, unsigned char, short, unsigned short, int, unsigned int,
-                                    std::int64_t, std::uint64_t>;
-TYPED_TEST_SUITE(BitDepth, ElementTypes);
-
-TYPED_TEST(BitDepth, PacksAndUnpacksEveryBitCountInEveryVariant) {
-    using T = TypeParam;
+void CheckEveryBitCount() {
     constexpr std::size_t kIndex = typeconv::detail::ComponentIndexOf<T>();
     std::mt19937_64 random(99);
     for (unsigned int bits : kBitCounts) {
@@ -113,19 +108,15 @@ TYPED_TEST(BitDepth, PacksAndUnpacksEveryBitCountInEveryVariant) {
             {"class", [&](const unsigned char* s, void* d, std::size_t n) {
                  unpacker->Promote(s, d, static_cast<unsigned int>(n));
              }}};
-        for (KernelVariant variant : typeconv::detail::kKernelVariants) {
-            if (const KernelSet* kernels = typeconv::detail::FindKernels(variant)) {
-                const std::string name = "variant " + std::to_string(static_cast<int>(variant));
-                packs.push_back({name, [=](const void* s, unsigned char* d, std::size_t n) {
-                                     if (n != 0) {
-                                         kernels->pack[kIndex](s, d, n, bits);
-                                     }
-                                 }});
-                unpacks.push_back({name, [=](const unsigned char* s, void* d, std::size_t n) {
-                                       kernels->unpack[kIndex](s, d, n, bits);
-                                   }});
-            }
-        }
+        const typeconv::detail::KernelSet& kernels = typeconv::detail::ActiveKernels();
+        packs.push_back({"kernel", [&](const void* s, unsigned char* d, std::size_t n) {
+                             if (n != 0) {
+                                 kernels.pack[kIndex](s, d, n, bits);
+                             }
+                         }});
+        unpacks.push_back({"kernel", [&](const unsigned char* s, void* d, std::size_t n) {
+                               kernels.unpack[kIndex](s, d, n, bits);
+                           }});
         for (std::size_t count : kLengths) {
             const std::vector<T> samples = RandomSamples<T>(count, bits, false, random);
             const std::vector<T> overWide = RandomSamples<T>(count, bits, true, random);
@@ -151,6 +142,18 @@ TYPED_TEST(BitDepth, PacksAndUnpacksEveryBitCountInEveryVariant) {
         }
     }
 }
+
+// BitDepth.<type>/<variant> for every integer component type.
+const bool kBitCountsRegistered = [] {
+    kubo_test::ForEachComponentType([](auto tag) {
+        using T = typename decltype(tag)::type;
+        if constexpr (std::is_integral_v<T>) {
+            kubo_test::RegisterPerVariant("BitDepth", kubo_test::TypeName<T>(),
+                                          &CheckEveryBitCount<T>, __FILE__, __LINE__);
+        }
+    });
+    return true;
+}();
 
 TEST(BitDepth, DocumentedLayouts) {
     const std::vector<unsigned char> bits = {1, 0, 1, 1, 0, 0, 0, 1, 1};
@@ -290,8 +293,13 @@ void CheckEverySpecialPromote(std::integer_sequence<unsigned int, N...>) {
     (CheckSpecialPromote<T, N>(), ...);
 }
 
-TYPED_TEST(BitDepth, TheFactoryCreatesEveryConverter) {
-    CheckEverySpecialPromote<TypeParam>(std::make_integer_sequence<unsigned int, 32>());
+TEST(BitDepth, TheFactoryCreatesEveryConverter) {
+    kubo_test::ForEachComponentType([](auto tag) {
+        using T = typename decltype(tag)::type;
+        if constexpr (std::is_integral_v<T>) {
+            CheckEverySpecialPromote<T>(std::make_integer_sequence<unsigned int, 32>());
+        }
+    });
 }
 
 }  // namespace

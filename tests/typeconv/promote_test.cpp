@@ -19,18 +19,18 @@
 #include <utility>
 #include <vector>
 
+#include "support/datatypes.h"
 #include "support/expectfailure.h"
+#include "support/kernelvariants.h"
 #include "support/promotereference.h"
 #include "vrkframework/basic/core/typeconv/complex2realpromote.h"
 #include "vrkframework/basic/core/typeconv/complexpromote.h"
-#include "vrkframework/basic/core/typeconv/kernels.h"
+#include "vrkframework/basic/core/typeconv/conversionkernels.h"
 #include "vrkframework/basic/core/typeconv/packedpromote.h"
 #include "vrkframework/basic/core/typeconv/real2complexpromote.h"
 
 namespace {
 
-using typeconv::detail::KernelSet;
-using typeconv::detail::KernelVariant;
 using typeconv::detail::SampleLayout;
 
 using kubo_test::Expected;
@@ -166,8 +166,6 @@ struct Pair {
     std::unique_ptr<typeconv::IPromote> (*newFamily)(SampleLayout layout);
 };
 
-void PrintTo(const Pair& pair, std::ostream* out) { *out << pair.name; }
-
 using Run = std::function<void(const void* src, void* dst, std::size_t count)>;
 
 /// Runs one family over `count` samples of the input values (cycled) and checks every
@@ -212,51 +210,35 @@ void CheckPair(const Pair& pair) {
     const std::vector<unsigned char> values = pair.inputs();
     for (SampleLayout layout : kLayouts) {
         const std::string family = "layout " + std::to_string(static_cast<int>(layout));
-        // Every variant this processor runs, over all the values at once and the lengths
+        // The kernels of the variant in use, over all the values at once and the lengths
         // that reach vector bodies and tails; 2500 samples cross the real to complex blocks.
-        for (KernelVariant variant : typeconv::detail::kKernelVariants) {
-            const KernelSet* kernels = typeconv::detail::FindKernels(variant);
-            if (kernels == nullptr) {
-                continue;
-            }
-            const std::string where =
-                family + ", variant " + std::to_string(static_cast<int>(variant));
-            const Run run = [&](const void* src, void* dst, std::size_t count) {
-                typeconv::detail::RunPromote(*kernels, layout, pair.from, pair.to, src, dst, count);
-            };
-            CheckFamily(pair, layout, values, values.size() / pair.fromSize, run, where);
-            CheckFamily(pair, layout, values, 2500, run, where);
-            for (std::size_t count : kLengths) {
-                CheckFamily(pair, layout, values, count, run, where);
-            }
+        const typeconv::detail::KernelSet& kernels = typeconv::detail::ActiveKernels();
+        const Run run = [&](const void* src, void* dst, std::size_t count) {
+            typeconv::detail::RunPromote(kernels, layout, pair.from, pair.to, src, dst, count);
+        };
+        CheckFamily(pair, layout, values, values.size() / pair.fromSize, run, family);
+        CheckFamily(pair, layout, values, 2500, run, family);
+        for (std::size_t count : kLengths) {
+            CheckFamily(pair, layout, values, count, run, family);
         }
         // The class, through its interface.
         const std::unique_ptr<typeconv::IPromote> promote = pair.newFamily(layout);
         EXPECT_EQ(promote->GetInputBits(), pair.fromSize * 8);
         EXPECT_EQ(promote->GetOutputBits(), pair.toSize * 8);
-        const Run run = [&](const void* src, void* dst, std::size_t count) {
+        const Run throughClass = [&](const void* src, void* dst, std::size_t count) {
             promote->Promote(src, dst, static_cast<unsigned int>(count));
         };
         for (std::size_t count : kLengths) {
-            CheckFamily(pair, layout, values, count, run, family + ", class");
+            CheckFamily(pair, layout, values, count, throughClass, family + ", class");
         }
     }
 }
 
 // ------------------------------------------------------------------ the 100 pairs
 
-template <class T>
-std::string Name() {
-    if constexpr (std::is_floating_point_v<T>) {
-        return sizeof(T) == 4 ? "Float32" : "Float64";
-    } else {
-        return std::string(std::is_signed_v<T> ? "Int" : "UInt") + std::to_string(sizeof(T) * 8);
-    }
-}
-
 template <class A, class B>
 Pair MakePair() {
-    return {Name<A>() + "_" + Name<B>(),
+    return {kubo_test::TypeName<A>() + "_" + kubo_test::TypeName<B>(),
             typeconv::detail::ComponentIndexOf<A>(),
             typeconv::detail::ComponentIndexOf<B>(),
             sizeof(A),
@@ -274,12 +256,14 @@ std::vector<Pair> AllPairs() {
     return pairs;
 }
 
-class EveryPair : public testing::TestWithParam<Pair> {};
-
-TEST_P(EveryPair, FollowsTheRuleInEveryFamilyAndVariant) { CheckPair(GetParam()); }
-
-INSTANTIATE_TEST_SUITE_P(Promote, EveryPair, testing::ValuesIn(AllPairs()),
-                         [](const testing::TestParamInfo<Pair>& pair) { return pair.param.name; });
+// Promote.<pair>/<variant>: every family of the pair, in each kernel variant.
+const bool kPairsRegistered = [] {
+    for (const Pair& pair : AllPairs()) {
+        kubo_test::RegisterPerVariant(
+            "Promote", pair.name, [pair] { CheckPair(pair); }, __FILE__, __LINE__);
+    }
+    return true;
+}();
 
 // ------------------------------------------------------------------ documented cases
 

@@ -3,28 +3,9 @@
 #ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_PACKEDOPERATIONS_H
 #define VRKFRAMEWORK_BASIC_CORE_TYPECONV_PACKEDOPERATIONS_H
 
-#include <cstdint>  // std::int64_t, std::uint64_t
-
 #include "vrkframework/basic/core/typeconv/ipromote.h"
+#include "vrkframework/basic/core/typeconv/typelist.h"  // KUBO_FOR_EACH_PACKED_LAYOUT
 #include "vrkframework/basic/kubo/kuboapi.h"
-
-/// Applies X(N, T) to every packed bit count N and integer component type T.
-#define KUBO_FOR_EACH_PACKED_LAYOUT(X)               \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, char)           \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, unsigned char)  \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, short)          \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, unsigned short) \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, int)            \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, unsigned int)   \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, std::int64_t)   \
-    KUBO_DETAIL_PACKED_BIT_COUNTS(X, std::uint64_t)
-
-// clang-format off
-#define KUBO_DETAIL_PACKED_BIT_COUNTS(X, T)                                                    \
-    X(1, T) X(2, T) X(3, T) X(4, T) X(5, T) X(6, T) X(7, T) X(9, T) X(10, T) X(11, T) X(12, T) \
-    X(13, T) X(14, T) X(15, T) X(17, T) X(18, T) X(19, T) X(20, T) X(21, T) X(22, T)         \
-    X(23, T) X(24, T) X(25, T) X(26, T) X(27, T) X(28, T) X(29, T) X(30, T) X(31, T)
-// clang-format on
 
 namespace typeconv::detail {
 

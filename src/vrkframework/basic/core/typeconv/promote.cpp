@@ -4,7 +4,7 @@
 
 #include <string>
 
-#include "vrkframework/basic/core/typeconv/kernels.h"
+#include "vrkframework/basic/core/typeconv/conversionkernels.h"
 #include "vrkframework/basic/core/typeconv/promoteoperations_impl.h"
 #include "vrkframework/platform/exception.h"
 

@@ -2,7 +2,7 @@
 #ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_PROMOTEOPERATIONS_IMPL_H
 #define VRKFRAMEWORK_BASIC_CORE_TYPECONV_PROMOTEOPERATIONS_IMPL_H
 
-#include "vrkframework/basic/core/typeconv/kernels.h"
+#include "vrkframework/basic/core/typeconv/conversionkernels.h"
 #include "vrkframework/basic/core/typeconv/promoteoperations.h"
 
 namespace typeconv::detail {

@@ -2,9 +2,11 @@
 // helper without early returns (selects, min/max shapes) so that the kernel loops calling
 // them vectorise. ConvertSample<B>(x) picks the rule of a pair.
 //
-// Every helper sits in an unnamed namespace: the kernel files include this header once
-// per instruction set, and internal linkage keeps an AVX2 copy of a helper from being
-// merged with, and used in place of, the baseline one.
+// Every helper sits in an unnamed namespace: each kernel variant compiles this header with
+// its own instruction set, and internal linkage keeps one variant's copy of a helper from
+// being merged with, and used in place of, another's. Where the vector units convert or
+// round directly (kernels/capabilities.h) a helper takes the direct form; elsewhere it
+// builds the same result from signed 32-bit conversions.
 #ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_SATURATE_H
 #define VRKFRAMEWORK_BASIC_CORE_TYPECONV_SATURATE_H
 
@@ -14,7 +16,12 @@
 #include <limits>
 #include <type_traits>
 
+#include "vrkframework/basic/core/kernels/capabilities.h"
+
 namespace typeconv::detail {
+
+using kora::kubo::detail::kVectorRounding;
+using kora::kubo::detail::kWideIntegerConversions;
 namespace {
 
 template <class T>
@@ -23,21 +30,6 @@ template <class T>
 constexpr bool kIsUnsigned64 = std::is_integral_v<T>&& std::is_unsigned_v<T> && sizeof(T) == 8;
 template <class T>
 constexpr bool kIsNarrowSigned = std::is_integral_v<T>&& std::is_signed_v<T> && sizeof(T) < 8;
-
-/// The instruction set this copy is compiled for. AVX-512 (F, DQ, VL) converts directly
-/// between floating values and unsigned 32-bit or any 64-bit integers, and has min and max
-/// of unsigned and 64-bit lanes; there plain conversions vectorise. Elsewhere the helpers
-/// build the same results from signed 32-bit conversions.
-#if defined(__AVX512F__) && defined(__AVX512DQ__) && defined(__AVX512VL__)
-constexpr bool kAvx512 = true;
-#else
-constexpr bool kAvx512 = false;
-#endif
-#if defined(__AVX2__)
-constexpr bool kAvx2 = true;
-#else
-constexpr bool kAvx2 = false;
-#endif
 
 template <class To, class From>
 inline To BitCast(From value) {
@@ -144,7 +136,8 @@ inline float Int64ToFloat(A x) {
 
 template <class B, class A>
 inline B IntegerToFloating(A x) {
-    if constexpr (sizeof(A) < 4 || (sizeof(A) == 4 && std::is_signed_v<A>) || kAvx512) {
+    if constexpr (sizeof(A) < 4 || (sizeof(A) == 4 && std::is_signed_v<A>) ||
+                  kWideIntegerConversions) {
         return static_cast<B>(x);
     } else if constexpr (sizeof(A) == 4) {
         return UInt32ToFloating<B>(x);
@@ -167,18 +160,20 @@ constexpr A LargestConvertibleBelow(A limit) {
                : limit - limit * std::numeric_limits<A>::epsilon() / 2;
 }
 
-/// The signed type a clamped A within the 32-bit range truncates through: under AVX-512
-/// a double converts to 64-bit lanes, like its own, which narrow faster than 32-bit ones.
+/// The signed type a clamped A within the 32-bit range truncates through: with wide integer
+/// conversions a double converts to 64-bit lanes, like its own, which narrow faster than
+/// 32-bit ones.
 template <class A>
-using Truncation = std::conditional_t<kAvx512 && sizeof(A) == 8, std::int64_t, std::int32_t>;
+using Truncation =
+    std::conditional_t<kWideIntegerConversions && sizeof(A) == 8, std::int64_t, std::int32_t>;
 
 /// Truncates c in [0, 2^32).
 template <class A>
 inline std::uint32_t TruncateToUInt32(A c) {
-    if constexpr (kAvx512) {
+    if constexpr (kWideIntegerConversions) {
         using Direct = std::conditional_t<sizeof(A) == 8, std::int64_t, std::uint32_t>;
         return static_cast<std::uint32_t>(static_cast<Direct>(c));
-    } else if constexpr (kAvx2) {
+    } else if constexpr (kVectorRounding) {
         // trunc(c) + 2^52 holds the integer in the low bits of its mantissa.
         return static_cast<std::uint32_t>(
             BitCast<std::uint64_t>(std::trunc(static_cast<double>(c)) + 0x1p52));
@@ -196,10 +191,10 @@ inline std::uint32_t TruncateToUInt32(A c) {
 /// Truncates c in [0, 2^64).
 template <class A>
 inline std::uint64_t TruncateToUInt64(A c) {
-    if constexpr (kAvx512) {
+    if constexpr (kWideIntegerConversions) {
         return static_cast<std::uint64_t>(c);
-    } else if constexpr (kAvx2) {
-        // AVX2 has no 64-bit conversion: the two halves of trunc(c) are exact doubles below
+    } else if constexpr (kVectorRounding) {
+        // Without 64-bit conversions: the two halves of trunc(c) are exact doubles below
         // 2^32, and each reads as an integer from the mantissa of its sum with 2^52.
         const double whole = std::trunc(static_cast<double>(c));
         const double high = std::trunc(whole * 0x1p-32);
@@ -243,7 +238,8 @@ inline A ClampMagnitude(A y, A limit) {
 
 /// Clamps y to [low, high] (low below 0 below high; NaN gives `nan`) on its bit pattern:
 /// read as unsigned, the negative values lie above the positive ones and grow with their
-/// magnitude; read as signed, they lie below. AVX-512 has both minimums for both widths.
+/// magnitude; read as signed, they lie below. Wide integer conversions come with both
+/// minimums for both widths.
 template <class A>
 inline A ClampOnBits(A y, A low, A high, A nan) {
     using Bits = SignedBits<A>;
@@ -266,7 +262,7 @@ inline B FloatingToNarrowSigned(A x) {
     constexpr A kLow = static_cast<A>(std::numeric_limits<B>::lowest());
     constexpr A kCeiling = LargestConvertibleBelow<A, B>(kHigh);
     constexpr std::int32_t kMax = std::numeric_limits<B>::max();
-    if constexpr (kAvx512) {
+    if constexpr (kWideIntegerConversions) {
         const A y = x + std::copysign(A(0.5), x);
         const A c = ClampOnBits(y, kLow, kCeiling, sizeof(B) < 4 ? A(0) : kLow);
         const B value = static_cast<B>(static_cast<Truncation<A>>(c));

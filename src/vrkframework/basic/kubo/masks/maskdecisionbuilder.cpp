@@ -9,7 +9,7 @@
 #include <typeinfo>   // typeid
 #include <utility>    // std::move
 
-#include "vrkframework/basic/kubo/masks/flagpacking.h"
+#include "vrkframework/basic/kubo/masks/maskloops.h"
 #include "vrkframework/basic/kubo/masks/mask.h"
 #include "vrkframework/basic/kubo/masks/maskdecision.h"
 #include "vrkframework/basic/kubo/masks/maskextent.h"

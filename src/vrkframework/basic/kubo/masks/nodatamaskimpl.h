@@ -13,13 +13,11 @@
 #include "vrkframework/basic/kubo/masks/bkgdrule.h"
 #include "vrkframework/basic/kubo/masks/imaskdecisionimpl.h"
 #include "vrkframework/basic/kubo/masks/nodatastorage.h"
-#include "vrkframework/basic/kubo/masks/onemorebit.h"
 #include "vrkframework/basic/kubo/masks/pixelflags.h"
-#include "vrkframework/basic/kubo/masks/vectorclones.h"
 
 /// One channel: a pixel is valid unless its sample equals the no-data value.
 template <class T>
-class KUBO_INTERNAL SingleChannelNoDataMaskImpl : public kora::kubo::IMaskDecisionImpl {
+class SingleChannelNoDataMaskImpl : public kora::kubo::IMaskDecisionImpl {
 public:
     explicit SingleChannelNoDataMaskImpl(T noData) : m_noData(noData) {}
 
@@ -39,7 +37,7 @@ private:
 /// Every channel compared with one shared value under `Rule`; the stride is the channel
 /// count. Named by rule through the aliases below.
 template <class T, kora::kubo::BkgdRule Rule>
-class KUBO_INTERNAL SameNoDataMaskImpl : public kora::kubo::IMaskDecisionImpl {
+class SameNoDataMaskImpl : public kora::kubo::IMaskDecisionImpl {
 public:
     SameNoDataMaskImpl(T noData, std::uint64_t channelCount)
         : m_noData(noData), m_channelCount(channelCount) {}
@@ -72,7 +70,7 @@ using SameNoDataChanPairsMaskImpl = SameNoDataMaskImpl<T, kora::kubo::BkgdChanPa
 /// of the wider type, one per raster channel, and untested channels hold its marker.
 /// Named by rule through the aliases below.
 template <class T, int Listed, class WiderT, kora::kubo::BkgdRule Rule>
-class KUBO_INTERNAL DiffNoDataMaskImpl : public kora::kubo::IMaskDecisionImpl {
+class DiffNoDataMaskImpl : public kora::kubo::IMaskDecisionImpl {
     static_assert(Listed == 0 || Listed == 1, "Listed is 0 or 1");
     static_assert(std::is_same_v<WiderT, kora::kubo::detail::WiderType<T>>,
                   "a family names the one wider type of its element type");
@@ -83,7 +81,7 @@ public:
     /// The same family for elements of type U: factories build every element type by
     /// rebinding one instance.
     template <class U>
-    class KUBO_INTERNAL Reassign
+    class Reassign
         : public DiffNoDataMaskImpl<U, Listed, kora::kubo::detail::WiderType<U>, Rule> {
         using Base = DiffNoDataMaskImpl<U, Listed, kora::kubo::detail::WiderType<U>, Rule>;
 
@@ -118,7 +116,7 @@ using DiffNoDataChanPairsMaskImpl =
     DiffNoDataMaskImpl<T, Listed, WiderT, kora::kubo::BkgdChanPairs>;
 
 /// No channel to test: every pixel is valid, whatever its type or stride.
-class KUBO_INTERNAL DummyNoDataMaskImpl : public kora::kubo::IMaskDecisionImpl {
+class DummyNoDataMaskImpl : public kora::kubo::IMaskDecisionImpl {
 public:
     void Evaluate(const void*, unsigned char* flags, std::size_t count) override {
         if (count != 0) {

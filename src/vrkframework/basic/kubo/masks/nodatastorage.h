@@ -1,5 +1,5 @@
 // How no-data values are stored for each element type, and how a stored value becomes the
-// per-channel test the pixel loops run in the sample's own type.
+// per-channel test the pixel loops run in the sample's own type (private to the library).
 #ifndef VRKFRAMEWORK_BASIC_KUBO_MASKS_NODATASTORAGE_H
 #define VRKFRAMEWORK_BASIC_KUBO_MASKS_NODATASTORAGE_H
 
@@ -7,7 +7,21 @@
 #include <limits>
 #include <type_traits>
 
-#include "vrkframework/basic/kubo/masks/onemorebit.h"
+/// A no-data value of type T and a tag: the storage of listed channels for the 64-bit
+/// element types, which have no wider type to hold an out-of-range marker. In the global
+/// namespace, as the kernel families that store it are.
+template <class T>
+struct OneMoreBit {
+    enum Tag : unsigned char {
+        kCompared = 0,     ///< a sample matches when it equals `value`
+        kUntested = 1,     ///< the channel is not tested
+        kMatchesNone = 2,  ///< no sample matches (never made by the factory)
+        kMatchesAll = 3    ///< every sample matches (never made by the factory)
+    };
+
+    T value;
+    unsigned char tag;
+};
 
 namespace kora::kubo::detail {
 
@@ -129,6 +143,11 @@ struct ChannelTest {
     bool IsTested() const { return tested; }
     bool Matches(T sample) const { return matchesAll | (byValue & (sample == value)); }
 };
+
+template <class Test>
+struct IsChannelTest : std::false_type {};
+template <class T>
+struct IsChannelTest<ChannelTest<T>> : std::true_type {};
 
 /// The test of one stored entry. A wider entry matches a sample exactly when it is a value
 /// of T and the sample equals it; so comparing in T gives the result of comparing the

@@ -1,5 +1,5 @@
-// The per-pixel loops of the no-data kernels: one flag byte per pixel (1 valid,
-// 0 background) from the pixel's samples and one test per channel.
+// How the no-data kernels flag pixels: one flag byte per pixel (1 valid, 0 background)
+// from the pixel's samples and one test per channel (private to the library).
 #ifndef VRKFRAMEWORK_BASIC_KUBO_MASKS_PIXELFLAGS_H
 #define VRKFRAMEWORK_BASIC_KUBO_MASKS_PIXELFLAGS_H
 
@@ -7,7 +7,9 @@
 #include <cstddef>  // std::size_t
 
 #include "vrkframework/basic/kubo/masks/bkgdrule.h"
-#include "vrkframework/basic/kubo/masks/vectorclones.h"
+#include "vrkframework/basic/core/typeconv/componenttraits.h"
+#include "vrkframework/basic/kubo/masks/maskloops.h"
+#include "vrkframework/basic/kubo/masks/nodatastorage.h"
 #include "vrkframework/platform/exception.h"
 
 namespace kora::kubo::detail {
@@ -31,7 +33,7 @@ inline void CheckFlagBuffers(const void* samples, const unsigned char* flags, st
 
 // The three rules, each as a scan that stops at the first decisive channel.
 template <BkgdRule Rule, class T, class TestAt>
-KUBO_INTERNAL unsigned char ScanPixel(const T* pixel, std::size_t stride, const TestAt& testAt,
+unsigned char ScanPixel(const T* pixel, std::size_t stride, const TestAt& testAt,
                                       bool hasNext) {
     if constexpr (Rule == BkgdAllChans) {
         for (std::size_t k = 0; k < stride; ++k) {
@@ -60,52 +62,8 @@ KUBO_INTERNAL unsigned char ScanPixel(const T* pixel, std::size_t stride, const 
     }
 }
 
-// The same rules for a stride known at compile time, without branches, so the loop over
-// pixels vectorises; as the tests have no side effects, the flags equal those of the scan.
-template <BkgdRule Rule, std::size_t C, bool kHasNext, class T, class Test>
-KUBO_INTERNAL inline unsigned char FixedPixelFlag(const T* pixel,
-                                                  const std::array<Test, C>& tests) {
-    bool valid = Rule != BkgdAllChans;
-    if constexpr (Rule == BkgdAllChans) {
-        for (std::size_t k = 0; k < C; ++k) {
-            const bool differs = !tests[k].Matches(pixel[k]);
-            valid |= tests[k].IsTested() & differs;
-        }
-    } else if constexpr (Rule == BkgdAnyChan) {
-        for (std::size_t k = 0; k < C; ++k) {
-            valid &= !tests[k].Matches(pixel[k]);
-        }
-    } else {
-        for (std::size_t k = 0; k + 1 < C; k += 2) {
-            const bool first = tests[k].Matches(pixel[k]);
-            const bool second = tests[k + 1].Matches(pixel[k + 1]);
-            valid &= !(first & second);
-        }
-        if constexpr (C % 2 == 1 && kHasNext) {
-            const bool first = tests[C - 1].Matches(pixel[C - 1]);
-            const bool second = tests[0].Matches(pixel[C]);
-            valid &= !(first & second);
-        }
-    }
-    return valid;
-}
-
-template <BkgdRule Rule, std::size_t C, class T, class Test>
-KUBO_CLONED_TEMPLATE void FlagFixedStride(const T* __restrict samples,
-                                          unsigned char* __restrict flags, std::size_t count,
-                                          const std::array<Test, C> tests) {
-    constexpr bool kReachesNext = Rule == BkgdChanPairs && C % 2 == 1;
-    const std::size_t followed = kReachesNext && count != 0 ? count - 1 : count;
-    for (std::size_t i = 0; i < followed; ++i) {
-        flags[i] = FixedPixelFlag<Rule, C, true>(samples + i * C, tests);
-    }
-    if (followed != count) {
-        flags[followed] = FixedPixelFlag<Rule, C, false>(samples + followed * C, tests);
-    }
-}
-
 template <std::size_t C, class TestAt>
-KUBO_INTERNAL auto TestsOf(const TestAt& testAt) {
+auto TestsOf(const TestAt& testAt) {
     std::array<decltype(testAt(0)), C> tests{};
     for (std::size_t k = 0; k < C; ++k) {
         tests[k] = testAt(k);
@@ -115,20 +73,26 @@ KUBO_INTERNAL auto TestsOf(const TestAt& testAt) {
 
 /// Flags `count` pixels of `stride` samples each under `Rule`; `testAt(k)` is the test of
 /// channel k. Strides 1 to 4, the common channel counts and one or two complex channels,
-/// run branch-free loops; wider pixels are scanned channel by channel.
+/// run the branch-free loops of the kernel variant in use; wider pixels are scanned channel
+/// by channel.
 template <BkgdRule Rule, class T, class TestAt>
-KUBO_INTERNAL void FlagPixels(const T* samples, unsigned char* flags, std::size_t count,
-                              std::size_t stride, const TestAt& testAt) {
+void FlagPixels(const T* samples, unsigned char* flags, std::size_t count, std::size_t stride,
+                const TestAt& testAt) {
     CheckFlagBuffers(samples, flags, count);
+    const auto loop = [&](auto tests) {
+        using Test = typename decltype(tests)::value_type;
+        ActiveMaskLoops().flag[Rule][tests.size() - 1][typeconv::detail::ComponentIndexOf<T>()]
+                             [IsChannelTest<Test>::value](samples, flags, count, tests.data());
+    };
     switch (stride) {
         case 1:
-            return FlagFixedStride<Rule>(samples, flags, count, TestsOf<1>(testAt));
+            return loop(TestsOf<1>(testAt));
         case 2:
-            return FlagFixedStride<Rule>(samples, flags, count, TestsOf<2>(testAt));
+            return loop(TestsOf<2>(testAt));
         case 3:
-            return FlagFixedStride<Rule>(samples, flags, count, TestsOf<3>(testAt));
+            return loop(TestsOf<3>(testAt));
         case 4:
-            return FlagFixedStride<Rule>(samples, flags, count, TestsOf<4>(testAt));
+            return loop(TestsOf<4>(testAt));
         default:
             for (std::size_t i = 0; i < count; ++i) {
                 flags[i] = ScanPixel<Rule>(samples + i * stride, stride, testAt, i + 1 < count);

@@ -5,10 +5,10 @@
 #include <cstdint>    // std::uint16_t, std::uint32_t, std::uint64_t
 #include <cstring>    // std::memcpy
 
-#include "vrkframework/basic/kubo/raster/bytesink.h"
+#include "vrkframework/basic/kubo/raster/runs/bytesink.h"
 #include "vrkframework/basic/kubo/raster/count32.h"
-#include "vrkframework/basic/kubo/raster/decodedbytes.h"
-#include "vrkframework/basic/kubo/raster/wordscan.h"
+#include "vrkframework/basic/kubo/raster/runs/decodedbytes.h"
+#include "vrkframework/basic/kubo/raster/runs/wordscan.h"
 #include "vrkframework/platform/exception.h"
 
 namespace kora::kubo {

@@ -1,134 +1,26 @@
-// The kernel loops and their table, compiled once per instruction set: each kernel file
-// includes this header once and returns kKernelSet. Everything here has internal
-// linkage so that the copies compiled for different instruction sets never mix.
-#ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_KERNELSET_IMPL_H
-#define VRKFRAMEWORK_BASIC_CORE_TYPECONV_KERNELSET_IMPL_H
+// The packed-stream codec: N-bit samples unpacked into and packed from whole-byte
+// integers, compiled once per kernel variant (private to the library; included by the
+// kernel tables only). Everything has internal linkage, so that the copies of different
+// variants never mix.
+#ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_PACKEDCODEC_IMPL_H
+#define VRKFRAMEWORK_BASIC_CORE_TYPECONV_PACKEDCODEC_IMPL_H
 
 #include <algorithm>  // std::min
+#include <cstddef>    // std::size_t
 #include <cstdint>
-#include <cstring>  // std::memcpy
 #include <type_traits>
-#include <utility>  // std::index_sequence
 
-#include "vrkframework/basic/core/typeconv/kernels.h"
-#include "vrkframework/basic/core/typeconv/saturate.h"
-#include "vrkframework/basic/core/typeconv/typelist.h"
+#include "vrkframework/basic/core/byteorder.h"
+#include "vrkframework/basic/core/kernels/capabilities.h"
 
 namespace typeconv::detail {
 namespace {
 
-// ---------------------------------------------------------------- element conversions
-
-/// Converts every Stride-th value: 1 for contiguous values, 2 for the real parts of
-/// (real, imaginary) pairs, read in place rather than gathered first.
-template <class A, class B, std::size_t Stride>
-void ConvertLoop(const A* __restrict src, B* __restrict dst, std::size_t count) {
-    for (std::size_t i = 0; i < count; ++i) {
-        dst[i] = ConvertSample<B>(src[Stride * i]);
-    }
-}
-
-template <class A, class B, std::size_t Stride>
-void Convert(const void* src, void* dst, std::size_t count) {
-    ConvertLoop<A, B, Stride>(static_cast<const A*>(src), static_cast<B*>(dst), count);
-}
-
-template <std::size_t Size>
-using UnsignedOfSize = std::conditional_t<
-    Size == 1, std::uint8_t,
-    std::conditional_t<Size == 2, std::uint16_t,
-                       std::conditional_t<Size == 4, std::uint32_t, std::uint64_t>>>;
-
-template <std::size_t Size>
-void Copy(const void* src, void* dst, std::size_t count) {
-    if (count != 0) {
-        std::memcpy(dst, src, count * Size);
-    }
-}
-
-/// Pairs whose rule is the identity on the bits share the copy (or, strided, the unsigned
-/// identity); unsigned sources into wider integers (zero extension) and signed 8/16/32-bit
-/// sources into 64-bit integers (negatives to 0) give the same bits for both signs of the
-/// destination and share the unsigned destination's kernel.
-///
-/// AVX-512 brings conversions and clamps of floating values to integers, conversions of
-/// unsigned 32-bit and 64-bit integers to floating values, and integer to floating
-/// widenings that write twice the bytes per instruction. The other kernels only clamp,
-/// widen, narrow or interleave, and their 512-bit forms stream out of cache slower than the
-/// AVX2 ones: the AVX-512 copy leaves them null, to be taken from the AVX2 set.
-template <class A, class B, std::size_t Stride>
-constexpr ConvertKernel SelectConvertKernel() {
-    constexpr bool kNeedsAvx512 = (std::is_floating_point_v<A> && std::is_integral_v<B>) ||
-                                  (std::is_integral_v<A> && std::is_floating_point_v<B>);
-    constexpr bool kSameBits =
-        sizeof(A) == sizeof(B) && std::is_integral_v<A> && std::is_integral_v<B> &&
-        (std::is_signed_v<A> == std::is_signed_v<B> || (std::is_signed_v<A> && sizeof(A) == 8));
-    if constexpr (kAvx512 && !kNeedsAvx512) {
-        return nullptr;
-    } else if constexpr ((std::is_same_v<A, B> || kSameBits) && Stride == 1) {
-        return &Copy<sizeof(A)>;
-    } else if constexpr (std::is_same_v<A, B> || kSameBits) {
-        return &Convert<UnsignedOfSize<sizeof(A)>, UnsignedOfSize<sizeof(A)>, Stride>;
-    } else if constexpr (std::is_integral_v<A> && std::is_integral_v<B> &&
-                         (std::is_unsigned_v<A> ? sizeof(B) > sizeof(A)
-                                                : sizeof(B) == 8 && sizeof(A) < 8)) {
-        return &Convert<A, std::make_unsigned_t<B>, Stride>;
-    } else {
-        return &Convert<A, B, Stride>;
-    }
-}
-
-template <class T>
-void InterleaveWithZeros(const void* values, void* pairs, std::size_t count) {
-    const T* __restrict in = static_cast<const T*>(values);
-    T* __restrict out = static_cast<T*>(pairs);
-    for (std::size_t i = 0; i < count; ++i) {
-        out[2 * i] = in[i];
-        out[2 * i + 1] = 0;
-    }
-}
-
-// ---------------------------------------------------------------- packed streams
-
-#if defined(__BYTE_ORDER__) && __BYTE_ORDER__ == __ORDER_BIG_ENDIAN__
-constexpr bool kLittleEndian = false;
-#else
-constexpr bool kLittleEndian = true;
-#endif
-
-inline std::uint64_t ByteSwap64(std::uint64_t word) {
-#if defined(__GNUC__)
-    return __builtin_bswap64(word);
-#else
-    word = word << 32 | word >> 32;
-    word = (word & 0x0000FFFF0000FFFFu) << 16 | (word >> 16 & 0x0000FFFF0000FFFFu);
-    return (word & 0x00FF00FF00FF00FFu) << 8 | (word >> 8 & 0x00FF00FF00FF00FFu);
-#endif
-}
-
-/// The 8 bytes at `bytes` as a number, the first byte lowest.
-inline std::uint64_t LoadLittleEndian64(const unsigned char* bytes) {
-    std::uint64_t word;
-    std::memcpy(&word, bytes, sizeof word);
-    return kLittleEndian ? word : ByteSwap64(word);
-}
-
-/// The 8 bytes at `bytes` as a number, the first byte highest.
-inline std::uint64_t LoadBigEndian64(const unsigned char* bytes) {
-    std::uint64_t word;
-    std::memcpy(&word, bytes, sizeof word);
-    return kLittleEndian ? ByteSwap64(word) : word;
-}
-
-inline void StoreLittleEndian64(unsigned char* bytes, std::uint64_t word) {
-    word = kLittleEndian ? word : ByteSwap64(word);
-    std::memcpy(bytes, &word, sizeof word);
-}
-
-inline void StoreBigEndian64(unsigned char* bytes, std::uint64_t word) {
-    word = kLittleEndian ? ByteSwap64(word) : word;
-    std::memcpy(bytes, &word, sizeof word);
-}
+using kora::kubo::detail::kVector64BitMultiply;
+using kora::kubo::detail::LoadHighFirst;
+using kora::kubo::detail::LoadLowFirst;
+using kora::kubo::detail::StoreHighFirst;
+using kora::kubo::detail::StoreLowFirst;
 
 /// How many leading samples of a `bits`-bit stream of `count` samples start in a byte
 /// followed by at least 7 more stream bytes: 8-byte accesses from their byte stay inside
@@ -168,13 +60,13 @@ std::size_t UnpackWithinBytes(const unsigned char* __restrict packed, T* __restr
     constexpr unsigned int kPerByte = 8 / Bits;
     for (std::size_t i = 0; i < count / kPerByte; ++i) {
         const unsigned int byte = packed[i];
-        if constexpr (Bits == 1 && sizeof(T) == 1 && kAvx512) {
-            // AVX-512 multiplies 64-bit lanes, which makes this the fastest there (the
-            // shifts are elsewhere): a copy of the byte in every byte of the word, masked
+        if constexpr (Bits == 1 && sizeof(T) == 1 && kVector64BitMultiply) {
+            // Where 64-bit lanes multiply this is the fastest (the shifts are elsewhere):
+            // a copy of the byte in every byte of the word, masked
             // to bit 7 - j in byte j; adding 0x7F carries each such bit into bit 7.
             const std::uint64_t spread = (byte * 0x0101010101010101u) & 0x0102040810204080u;
             const std::uint64_t ones = (spread + 0x7F7F7F7F7F7F7F7Fu) >> 7 & 0x0101010101010101u;
-            StoreLittleEndian64(reinterpret_cast<unsigned char*>(samples + 8 * i), ones);
+            StoreLowFirst(reinterpret_cast<unsigned char*>(samples + 8 * i), ones);
         } else {
             for (unsigned int j = 0; j < kPerByte; ++j) {
                 samples[kPerByte * i + j] =
@@ -211,7 +103,7 @@ std::size_t UnpackWords(const unsigned char* __restrict packed, T* __restrict sa
     const std::size_t end = count < PerWord ? 0 : std::min(windowed, count - PerWord + 1);
     std::size_t done = 0;
     for (std::size_t position = 0; done < end; done += PerWord, position += PerWord * bits) {
-        std::uint64_t word = LoadBigEndian64(packed + position / 8) << (position % 8);
+        std::uint64_t word = LoadHighFirst(packed + position / 8) << (position % 8);
         for (unsigned int j = 0; j < PerWord; ++j) {
             samples[done + j] = static_cast<T>(word >> (64 - bits));
             word <<= bits;
@@ -254,7 +146,7 @@ std::size_t PackWithinBytes(const T* __restrict samples, unsigned char* __restri
     for (std::size_t i = 0; i < count / kPerByte; ++i) {
         if constexpr (Bits == 1 && sizeof(T) == 1) {
             const std::uint64_t lows =
-                LoadLittleEndian64(reinterpret_cast<const unsigned char*>(samples + 8 * i)) &
+                LoadLowFirst(reinterpret_cast<const unsigned char*>(samples + 8 * i)) &
                 0x0101010101010101u;
             packed[i] = static_cast<unsigned char>((lows * 0x8040201008040201u) >> 56);
         } else {
@@ -307,7 +199,7 @@ public:
     void Append(std::uint64_t word, unsigned int bits) {
         m_pending |= word << (64 - m_fill - bits);
         m_fill += bits;
-        StoreBigEndian64(m_next, m_pending);
+        StoreHighFirst(m_next, m_pending);
         m_next += m_fill / 8;
         m_pending <<= m_fill / 8 * 8;
         m_fill %= 8;
@@ -390,59 +282,7 @@ void Pack(const void* source, unsigned char* packed, std::size_t count, unsigned
     }
 }
 
-// ---------------------------------------------------------------- the table
-
-template <std::size_t Index, class List = priv::ComponentTypes>
-struct ComponentAt : ComponentAt<Index - 1, typename List::tail> {};
-template <class List>
-struct ComponentAt<0, List> {
-    using type = typename List::head;
-};
-
-template <std::size_t Index>
-using Component = typename ComponentAt<Index>::type;
-
-template <class A, std::size_t Stride, std::size_t... To>
-constexpr std::array<ConvertKernel, kComponentCount> MakeConvertRow(std::index_sequence<To...>) {
-    return {{SelectConvertKernel<A, Component<To>, Stride>()...}};
-}
-
-template <class T>
-constexpr UnpackKernel SelectUnpackKernel() {
-    if constexpr (std::is_integral_v<T>) {
-        return &Unpack<std::make_unsigned_t<T>>;
-    } else {
-        return nullptr;
-    }
-}
-
-template <class T>
-constexpr PackKernel SelectPackKernel() {
-    if constexpr (std::is_integral_v<T>) {
-        return &Pack<T>;
-    } else {
-        return nullptr;
-    }
-}
-
-template <std::size_t... Index>
-constexpr KernelSet MakeKernelSet(std::index_sequence<Index...> indices) {
-    return KernelSet{
-        {{MakeConvertRow<Component<Index>, 1>(indices)...}},
-        {{MakeConvertRow<Component<Index>, 2>(indices)...}},
-        kAvx512 ? std::array<ConvertKernel, 4>{}
-                : std::array<ConvertKernel, 4>{{&InterleaveWithZeros<std::uint8_t>,
-                                                &InterleaveWithZeros<std::uint16_t>,
-                                                &InterleaveWithZeros<std::uint32_t>,
-                                                &InterleaveWithZeros<std::uint64_t>}},
-        {{SelectUnpackKernel<Component<Index>>()...}},
-        {{SelectPackKernel<Component<Index>>()...}},
-    };
-}
-
-constexpr KernelSet kKernelSet = MakeKernelSet(std::make_index_sequence<kComponentCount>());
-
 }  // namespace
 }  // namespace typeconv::detail
 
-#endif  // VRKFRAMEWORK_BASIC_CORE_TYPECONV_KERNELSET_IMPL_H
+#endif  // VRKFRAMEWORK_BASIC_CORE_TYPECONV_PACKEDCODEC_IMPL_H

@@ -1,7 +1,7 @@
 // The growing output of an encoder, trimmed to what was written and handed to its owner
 // (private to the library).
-#ifndef VRKFRAMEWORK_BASIC_KUBO_RASTER_BYTESINK_H
-#define VRKFRAMEWORK_BASIC_KUBO_RASTER_BYTESINK_H
+#ifndef VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_BYTESINK_H
+#define VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_BYTESINK_H
 
 #include <cstddef>  // std::size_t
 #include <cstdlib>  // std::aligned_alloc, std::malloc, std::realloc, std::free
@@ -104,4 +104,4 @@ private:
 
 }  // namespace kora::kubo::detail
 
-#endif  // VRKFRAMEWORK_BASIC_KUBO_RASTER_BYTESINK_H
+#endif  // VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_BYTESINK_H

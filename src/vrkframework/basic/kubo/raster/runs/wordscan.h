@@ -1,34 +1,22 @@
 // Word-at-a-time searches for the end of a run of equal bytes or bits, used by the
 // run-length encoders (private to the library).
-#ifndef VRKFRAMEWORK_BASIC_KUBO_RASTER_WORDSCAN_H
-#define VRKFRAMEWORK_BASIC_KUBO_RASTER_WORDSCAN_H
+#ifndef VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_WORDSCAN_H
+#define VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_WORDSCAN_H
 
 #include <algorithm>  // std::min
 #include <cstddef>    // std::size_t
 #include <cstdint>    // std::uint64_t
 #include <cstring>    // std::memcpy
 
+#include "vrkframework/basic/core/byteorder.h"
+
 #if defined(_MSC_VER) && !defined(__clang__)
-#include <intrin.h>  // _BitScanForward64, _BitScanReverse64, _byteswap_uint64
+#include <intrin.h>  // _BitScanForward64, _BitScanReverse64
 #endif
 
 namespace kora::kubo::detail {
 
-#if defined(__BYTE_ORDER__)
-constexpr bool kLittleEndian = __BYTE_ORDER__ == __ORDER_LITTLE_ENDIAN__;
-#else
-constexpr bool kLittleEndian = true;  // the MSVC targets are all little-endian
-#endif
-
 constexpr std::uint64_t kEveryByte = 0x0101010101010101ull;
-
-inline std::uint64_t ByteSwap(std::uint64_t value) {
-#if defined(_MSC_VER) && !defined(__clang__)
-    return _byteswap_uint64(value);
-#else
-    return __builtin_bswap64(value);
-#endif
-}
 
 /// Index of the lowest set bit; `value` is not 0.
 inline unsigned int LowestSetBit(std::uint64_t value) {
@@ -52,20 +40,6 @@ inline unsigned int LeadingZeros(std::uint64_t value) {
 #endif
 }
 
-/// The 8 bytes at `bytes` with bytes[0] in the lowest byte.
-inline std::uint64_t LoadLowFirst(const unsigned char* bytes) {
-    std::uint64_t word;
-    std::memcpy(&word, bytes, sizeof word);
-    return kLittleEndian ? word : ByteSwap(word);
-}
-
-/// Stores the 4 bytes of `word` at `bytes`, lowest byte first.
-inline void StoreLowFirst(unsigned char* bytes, std::uint32_t word) {
-    const auto ordered =
-        kLittleEndian ? word : static_cast<std::uint32_t>(ByteSwap(std::uint64_t{word}) >> 32);
-    std::memcpy(bytes, &ordered, sizeof ordered);
-}
-
 /// Flags the high bit of every zero byte of `word`. A borrow can flag a byte above a zero
 /// one as well, never one below: the result is 0 exactly when no byte is zero, and its
 /// lowest flag is exact.
@@ -79,14 +53,6 @@ inline std::uint64_t SumOfEightBytes(const unsigned char* bytes) {
     const std::uint64_t word = LoadLowFirst(bytes);
     const std::uint64_t pairs = (word & kLowBytes) + ((word >> 8) & kLowBytes);
     return (pairs * 0x0001000100010001ull) >> 48;
-}
-
-/// The 8 bytes at `bytes` with bytes[0] in the highest byte, so that the bit stream read
-/// most significant bit first runs from bit 63 down.
-inline std::uint64_t LoadHighFirst(const unsigned char* bytes) {
-    std::uint64_t word;
-    std::memcpy(&word, bytes, sizeof word);
-    return kLittleEndian ? ByteSwap(word) : word;
 }
 
 /// As LoadHighFirst for the `count` (< 8) bytes left at the end of a buffer; the missing
@@ -162,4 +128,4 @@ inline std::uint64_t FindBitChange(const unsigned char* data, std::uint64_t begi
 
 }  // namespace kora::kubo::detail
 
-#endif  // VRKFRAMEWORK_BASIC_KUBO_RASTER_WORDSCAN_H
+#endif  // VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_WORDSCAN_H

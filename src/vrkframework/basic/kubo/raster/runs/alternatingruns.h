@@ -1,13 +1,13 @@
 // The run format shared by the bit-stream and the row mask encoders: one byte per run,
 // runs alternately clear and set starting with clear, a 0 after a run of 255 whose value
 // goes on, and a leading 0 when the data starts set (private to the library).
-#ifndef VRKFRAMEWORK_BASIC_KUBO_RASTER_ALTERNATINGRUNS_H
-#define VRKFRAMEWORK_BASIC_KUBO_RASTER_ALTERNATINGRUNS_H
+#ifndef VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_ALTERNATINGRUNS_H
+#define VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_ALTERNATINGRUNS_H
 
 #include <cstddef>  // std::size_t
 #include <cstdint>  // std::uint64_t
 
-#include "bytesink.h"
+#include "vrkframework/basic/kubo/raster/runs/bytesink.h"
 
 namespace kora::kubo::detail {
 
@@ -52,4 +52,4 @@ inline bool RunValue(std::size_t index) { return index % 2 == 1; }
 
 }  // namespace kora::kubo::detail
 
-#endif  // VRKFRAMEWORK_BASIC_KUBO_RASTER_ALTERNATINGRUNS_H
+#endif  // VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_ALTERNATINGRUNS_H

@@ -1,7 +1,7 @@
 // Decoded output: filling it with one value, and new buffers handed to the caller
 // (private to the library).
-#ifndef VRKFRAMEWORK_BASIC_KUBO_RASTER_DECODEDBYTES_H
-#define VRKFRAMEWORK_BASIC_KUBO_RASTER_DECODEDBYTES_H
+#ifndef VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_DECODEDBYTES_H
+#define VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_DECODEDBYTES_H
 
 #include <cstddef>  // std::size_t
 #include <cstring>  // std::memset
@@ -30,4 +30,4 @@ unsigned char* NewDecoded(std::size_t size, Decode decode) {
 
 }  // namespace kora::kubo::detail
 
-#endif  // VRKFRAMEWORK_BASIC_KUBO_RASTER_DECODEDBYTES_H
+#endif  // VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_DECODEDBYTES_H

@@ -1,0 +1,37 @@
+// What the instruction set a file is compiled for does in one vector instruction. The
+// kernels choose between equally exact formulations by these capabilities, never by the
+// name of an instruction set; each kernel variant file sees its own values (private to
+// the library).
+#ifndef VRKFRAMEWORK_BASIC_CORE_KERNELS_CAPABILITIES_H
+#define VRKFRAMEWORK_BASIC_CORE_KERNELS_CAPABILITIES_H
+
+namespace kora::kubo::detail {
+
+/// Conversions between floating lanes and unsigned 32-bit or any 64-bit integer lanes, and
+/// min and max of unsigned and 64-bit lanes: there the plain conversions vectorise.
+constexpr bool kWideIntegerConversions =
+#if defined(__AVX512F__) && defined(__AVX512DQ__) && defined(__AVX512VL__)
+    true;
+#else
+    false;
+#endif
+
+/// Multiplication of 64-bit lanes.
+constexpr bool kVector64BitMultiply =
+#if defined(__AVX512DQ__) && defined(__AVX512VL__)
+    true;
+#else
+    false;
+#endif
+
+/// Rounding of floating lanes toward zero, to whole values.
+constexpr bool kVectorRounding =
+#if defined(__SSE4_1__) || defined(__ARM_NEON)
+    true;
+#else
+    false;
+#endif
+
+}  // namespace kora::kubo::detail
+
+#endif  // VRKFRAMEWORK_BASIC_CORE_KERNELS_CAPABILITIES_H

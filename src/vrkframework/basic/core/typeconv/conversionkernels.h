@@ -1,0 +1,69 @@
+// The conversion kernels behind the promote classes: the table of one kernel variant, the
+// table in use, and the drivers the classes call (private to the library).
+#ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_CONVERSIONKERNELS_H
+#define VRKFRAMEWORK_BASIC_CORE_TYPECONV_CONVERSIONKERNELS_H
+
+#include <array>
+#include <climits>  // INT_MAX
+#include <cstddef>  // std::size_t
+
+#include "vrkframework/basic/core/typeconv/componenttraits.h"
+#include "vrkframework/basic/core/typeconv/promoteoperations.h"
+
+namespace typeconv::detail {
+
+/// `count` values of the source to `count` values of the destination.
+using ConvertKernel = void (*)(const void* src, void* dst, std::size_t count);
+/// `count` samples of `bits` bits from a packed stream into whole-byte samples.
+using UnpackKernel = void (*)(const unsigned char* packed, void* samples, std::size_t count,
+                              unsigned int bits);
+/// `count` whole-byte samples into a packed stream of `bits`-bit samples.
+using PackKernel = void (*)(const void* samples, unsigned char* packed, std::size_t count,
+                            unsigned int bits);
+
+/// Every conversion kernel of one kernel variant; a null entry is taken from the variant
+/// before it.
+struct KernelSet {
+    /// [source index][destination index]: contiguous values, rule per value.
+    std::array<std::array<ConvertKernel, kComponentCount>, kComponentCount> convert;
+    /// [source index][destination index]: the real parts of (real, imaginary) pairs.
+    std::array<std::array<ConvertKernel, kComponentCount>, kComponentCount> convertRealParts;
+    /// [log2 of the value size]: values to (value, 0) pairs.
+    std::array<ConvertKernel, 4> interleaveWithZeros;
+    /// [component index]: null for float and double.
+    std::array<UnpackKernel, kComponentCount> unpack;
+    std::array<PackKernel, kComponentCount> pack;
+};
+
+/// Replaces every null kernel of `kernels` by the one of `before`.
+void FillGaps(KernelSet& kernels, const KernelSet& before);
+
+/// The conversion kernels of the kernel variant in use.
+const KernelSet& ActiveKernels();
+
+/// Runs the conversion of `count` samples of a family's layout.
+void RunPromote(const KernelSet& kernels, SampleLayout layout, std::size_t from, std::size_t to,
+                const void* src, void* dst, std::size_t count);
+
+/// Reports a null source or destination for a conversion that has samples to convert
+/// (kora::DataException): no buffer can be read or written at a null address.
+[[noreturn]] void ThrowNullBuffer();
+inline void CheckBuffers(const void* src, const void* dst, std::size_t count) {
+    if (count != 0 && (src == nullptr || dst == nullptr)) {
+        ThrowNullBuffer();
+    }
+}
+
+/// The bit-depth kernels treat counts as signed 32-bit values: below 1 converts nothing.
+constexpr bool IsPackedCountPositive(unsigned int count) {
+    return count != 0 && count <= static_cast<unsigned int>(INT_MAX);
+}
+
+/// Reports N above the bits of the element type (kora::Exception, line 390 for unpacking
+/// and 395 for packing); `typeName` is the framework's spelling of the element type.
+[[noreturn]] void ThrowUnpackBitsTooWide(unsigned int bits, const char* typeName);
+[[noreturn]] void ThrowPackBitsTooWide(unsigned int bits, const char* typeName);
+
+}  // namespace typeconv::detail
+
+#endif  // VRKFRAMEWORK_BASIC_CORE_TYPECONV_CONVERSIONKERNELS_H

@@ -1,0 +1,91 @@
+// The element conversion loops of every pair of component types, compiled once per kernel
+// variant (private to the library; included by the kernel tables only). Everything has
+// internal linkage, so that the copies of different variants never mix.
+#ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_ELEMENTKERNELS_IMPL_H
+#define VRKFRAMEWORK_BASIC_CORE_TYPECONV_ELEMENTKERNELS_IMPL_H
+
+#include <cstdint>
+#include <cstring>  // std::memcpy
+#include <type_traits>
+
+#include "vrkframework/basic/core/kernels/capabilities.h"
+#include "vrkframework/basic/core/typeconv/conversionkernels.h"
+#include "vrkframework/basic/core/typeconv/saturate.h"
+
+namespace typeconv::detail {
+namespace {
+
+/// Converts every Stride-th value: 1 for contiguous values, 2 for the real parts of
+/// (real, imaginary) pairs, read in place rather than gathered first.
+template <class A, class B, std::size_t Stride>
+void ConvertLoop(const A* __restrict src, B* __restrict dst, std::size_t count) {
+    for (std::size_t i = 0; i < count; ++i) {
+        dst[i] = ConvertSample<B>(src[Stride * i]);
+    }
+}
+
+template <class A, class B, std::size_t Stride>
+void Convert(const void* src, void* dst, std::size_t count) {
+    ConvertLoop<A, B, Stride>(static_cast<const A*>(src), static_cast<B*>(dst), count);
+}
+
+template <std::size_t Size>
+using UnsignedOfSize = std::conditional_t<
+    Size == 1, std::uint8_t,
+    std::conditional_t<Size == 2, std::uint16_t,
+                       std::conditional_t<Size == 4, std::uint32_t, std::uint64_t>>>;
+
+template <std::size_t Size>
+void Copy(const void* src, void* dst, std::size_t count) {
+    if (count != 0) {
+        std::memcpy(dst, src, count * Size);
+    }
+}
+
+/// Pairs whose rule is the identity on the bits share the copy (or, strided, the unsigned
+/// identity); unsigned sources into wider integers (zero extension) and signed 8/16/32-bit
+/// sources into 64-bit integers (negatives to 0) give the same bits for both signs of the
+/// destination and share the unsigned destination's kernel.
+///
+/// Wide integer conversions bring conversions and clamps of floating values to integers,
+/// conversions of unsigned 32-bit and 64-bit integers to floating values, and integer to
+/// floating widenings that write twice the bytes per instruction. The other kernels only
+/// clamp, widen, narrow or interleave, and the wider vectors that come with those
+/// conversions stream them out of cache slower: a variant with them leaves the others
+/// null, to be taken from the variant before it.
+template <class A, class B, std::size_t Stride>
+constexpr ConvertKernel SelectConvertKernel() {
+    constexpr bool kConvertsNumberKind = (std::is_floating_point_v<A> && std::is_integral_v<B>) ||
+                                         (std::is_integral_v<A> && std::is_floating_point_v<B>);
+    constexpr bool kSameBits =
+        sizeof(A) == sizeof(B) && std::is_integral_v<A> && std::is_integral_v<B> &&
+        (std::is_signed_v<A> == std::is_signed_v<B> || (std::is_signed_v<A> && sizeof(A) == 8));
+    if constexpr (kWideIntegerConversions && !kConvertsNumberKind) {
+        return nullptr;
+    } else if constexpr ((std::is_same_v<A, B> || kSameBits) && Stride == 1) {
+        return &Copy<sizeof(A)>;
+    } else if constexpr (std::is_same_v<A, B> || kSameBits) {
+        return &Convert<UnsignedOfSize<sizeof(A)>, UnsignedOfSize<sizeof(A)>, Stride>;
+    } else if constexpr (std::is_integral_v<A> && std::is_integral_v<B> &&
+                         (std::is_unsigned_v<A> ? sizeof(B) > sizeof(A)
+                                                : sizeof(B) == 8 && sizeof(A) < 8)) {
+        return &Convert<A, std::make_unsigned_t<B>, Stride>;
+    } else {
+        return &Convert<A, B, Stride>;
+    }
+}
+
+template <class T>
+void InterleaveWithZeros(const void* values, void* pairs, std::size_t count) {
+    const T* __restrict in = static_cast<const T*>(values);
+    T* __restrict out = static_cast<T*>(pairs);
+    for (std::size_t i = 0; i < count; ++i) {
+        out[2 * i] = in[i];
+        out[2 * i + 1] = 0;
+    }
+}
+
+}  // namespace
+}  // namespace typeconv::detail
+
+#endif  // VRKFRAMEWORK_BASIC_CORE_TYPECONV_ELEMENTKERNELS_IMPL_H
