@@ -11,8 +11,8 @@
 #include <vector>
 
 #include "memcpyreference.h"
-#include "vrkframework/basic/core/typeconv/typelist.h"
 #include "vrkframework/basic/core/typeconv/promote.h"
+#include "vrkframework/basic/core/typeconv/typelist.h"
 #include "vrkframework/basic/kubo/raster/datatype.h"
 #include "vrkframework/basic/kubo/raster/promotefactory.h"
 

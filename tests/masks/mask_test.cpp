@@ -142,10 +142,10 @@ void CheckPackingOfEveryLength() {
         EXPECT_EQ(BytesOf(mask), expected) << count;
     }
 }
-const bool kPackingRegistered = (kubo_test::RegisterPerVariant("Mask", "PacksFlagsOfEveryLength",
-                                                               &CheckPackingOfEveryLength,
-                                                               __FILE__, __LINE__),
-                                 true);
+const bool kPackingRegistered =
+    (kubo_test::RegisterPerVariant("Mask", "PacksFlagsOfEveryLength", &CheckPackingOfEveryLength,
+                                   __FILE__, __LINE__),
+     true);
 
 CoordinateMaskBuilder BuilderOf(const Pairs& coordinates) {
     CoordinateMaskBuilder builder;

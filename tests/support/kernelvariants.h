@@ -90,10 +90,9 @@ inline void RegisterPerVariant(const char* suite, const std::string& name,
                                const std::function<void()>& body, const char* file, int line) {
     for (KernelVariant variant = 0; variant < kora::kubo::detail::kKernelVariantCount; ++variant) {
         const std::string test = name + "/" + kora::kubo::detail::KernelVariantName(variant);
-        testing::RegisterTest(suite, test.c_str(), nullptr, nullptr, file, line,
-                              [variant, body]() -> testing::Test* {
-                                  return new VariantTest(variant, body);
-                              });
+        testing::RegisterTest(
+            suite, test.c_str(), nullptr, nullptr, file, line,
+            [variant, body]() -> testing::Test* { return new VariantTest(variant, body); });
     }
 }
 

@@ -2,8 +2,8 @@
 #ifndef VRKFRAMEWORK_BASIC_CORE_TYPECONV_COMPLEXPROMOTE_H
 #define VRKFRAMEWORK_BASIC_CORE_TYPECONV_COMPLEXPROMOTE_H
 
-#include "vrkframework/basic/core/typeconv/typelist.h"
 #include "vrkframework/basic/core/typeconv/promoteoperations.h"
+#include "vrkframework/basic/core/typeconv/typelist.h"
 #include "vrkframework/basic/kubo/kuboapi.h"
 
 namespace typeconv {

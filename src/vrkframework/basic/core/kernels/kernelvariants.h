@@ -16,7 +16,8 @@ using KernelVariant = std::size_t;
 
 #define KUBO_DETAIL_COUNT_VARIANT(name, supported) +1
 /// Number of variants this build compiles.
-constexpr std::size_t kKernelVariantCount = 0 KUBO_FOR_EACH_KERNEL_VARIANT(KUBO_DETAIL_COUNT_VARIANT);
+constexpr std::size_t kKernelVariantCount =
+    0 KUBO_FOR_EACH_KERNEL_VARIANT(KUBO_DETAIL_COUNT_VARIANT);
 #undef KUBO_DETAIL_COUNT_VARIANT
 
 /// The variant's name, as test and benchmark names show it ("baseline", "avx2", ...).

@@ -47,11 +47,12 @@ constexpr KernelSet MakeKernelSet(std::index_sequence<Index...> indices) {
     return KernelSet{
         {{MakeConvertRow<Component<Index>, 1>(indices)...}},
         {{MakeConvertRow<Component<Index>, 2>(indices)...}},
-        kWideIntegerConversions ? std::array<ConvertKernel, 4>{}
-                : std::array<ConvertKernel, 4>{{&InterleaveWithZeros<std::uint8_t>,
-                                                &InterleaveWithZeros<std::uint16_t>,
-                                                &InterleaveWithZeros<std::uint32_t>,
-                                                &InterleaveWithZeros<std::uint64_t>}},
+        kWideIntegerConversions
+            ? std::array<ConvertKernel, 4>{}
+            : std::array<ConvertKernel, 4>{{&InterleaveWithZeros<std::uint8_t>,
+                                            &InterleaveWithZeros<std::uint16_t>,
+                                            &InterleaveWithZeros<std::uint32_t>,
+                                            &InterleaveWithZeros<std::uint64_t>}},
         {{SelectUnpackKernel<Component<Index>>()...}},
         {{SelectPackKernel<Component<Index>>()...}},
     };

@@ -6,8 +6,8 @@
 #include <cstring>  // std::memcpy
 #include <string>   // std::to_string
 
-#include "vrkframework/basic/kubo/masks/maskloops.h"
 #include "vrkframework/basic/kubo/masks/maskextent.h"
+#include "vrkframework/basic/kubo/masks/maskloops.h"
 #include "vrkframework/basic/kubo/raster/bufferextent.h"
 #include "vrkframework/platform/exception.h"
 

@@ -9,10 +9,10 @@
 #include <typeinfo>   // typeid
 #include <utility>    // std::move
 
-#include "vrkframework/basic/kubo/masks/maskloops.h"
 #include "vrkframework/basic/kubo/masks/mask.h"
 #include "vrkframework/basic/kubo/masks/maskdecision.h"
 #include "vrkframework/basic/kubo/masks/maskextent.h"
+#include "vrkframework/basic/kubo/masks/maskloops.h"
 #include "vrkframework/basic/kubo/raster/bufferextent.h"
 #include "vrkframework/basic/kubo/raster/raster.h"
 

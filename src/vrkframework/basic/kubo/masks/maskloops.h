@@ -21,9 +21,8 @@ using PackLoop = void (*)(const unsigned char* flags, unsigned char* bits, std::
 /// The loops of one kernel variant; a null entry is taken from the variant before it.
 struct MaskLoops {
     /// [rule][samples per pixel - 1][component index][0 plain tests, 1 channel tests].
-    std::array<std::array<std::array<std::array<FlagLoop, 2>, typeconv::detail::kComponentCount>,
-                          4>,
-               3>
+    std::array<
+        std::array<std::array<std::array<FlagLoop, 2>, typeconv::detail::kComponentCount>, 4>, 3>
         flag;
     PackLoop pack;
 };

@@ -20,8 +20,7 @@ namespace {
 // The same rules for a stride known at compile time, without branches, so the loop over
 // pixels vectorises; as the tests have no side effects, the flags equal those of the scan.
 template <BkgdRule Rule, std::size_t C, bool kHasNext, class T, class Test>
-inline unsigned char FixedPixelFlag(const T* pixel,
-                                                  const std::array<Test, C>& tests) {
+inline unsigned char FixedPixelFlag(const T* pixel, const std::array<Test, C>& tests) {
     bool valid = Rule != BkgdAllChans;
     if constexpr (Rule == BkgdAllChans) {
         for (std::size_t k = 0; k < C; ++k) {

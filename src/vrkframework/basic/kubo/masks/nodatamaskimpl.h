@@ -81,8 +81,7 @@ public:
     /// The same family for elements of type U: factories build every element type by
     /// rebinding one instance.
     template <class U>
-    class Reassign
-        : public DiffNoDataMaskImpl<U, Listed, kora::kubo::detail::WiderType<U>, Rule> {
+    class Reassign : public DiffNoDataMaskImpl<U, Listed, kora::kubo::detail::WiderType<U>, Rule> {
         using Base = DiffNoDataMaskImpl<U, Listed, kora::kubo::detail::WiderType<U>, Rule>;
 
     public:

@@ -6,8 +6,8 @@
 #include <array>
 #include <cstddef>  // std::size_t
 
-#include "vrkframework/basic/kubo/masks/bkgdrule.h"
 #include "vrkframework/basic/core/typeconv/componenttraits.h"
+#include "vrkframework/basic/kubo/masks/bkgdrule.h"
 #include "vrkframework/basic/kubo/masks/maskloops.h"
 #include "vrkframework/basic/kubo/masks/nodatastorage.h"
 #include "vrkframework/platform/exception.h"
@@ -33,8 +33,7 @@ inline void CheckFlagBuffers(const void* samples, const unsigned char* flags, st
 
 // The three rules, each as a scan that stops at the first decisive channel.
 template <BkgdRule Rule, class T, class TestAt>
-unsigned char ScanPixel(const T* pixel, std::size_t stride, const TestAt& testAt,
-                                      bool hasNext) {
+unsigned char ScanPixel(const T* pixel, std::size_t stride, const TestAt& testAt, bool hasNext) {
     if constexpr (Rule == BkgdAllChans) {
         for (std::size_t k = 0; k < stride; ++k) {
             const auto test = testAt(k);
@@ -82,7 +81,7 @@ void FlagPixels(const T* samples, unsigned char* flags, std::size_t count, std::
     const auto loop = [&](auto tests) {
         using Test = typename decltype(tests)::value_type;
         ActiveMaskLoops().flag[Rule][tests.size() - 1][typeconv::detail::ComponentIndexOf<T>()]
-                             [IsChannelTest<Test>::value](samples, flags, count, tests.data());
+                              [IsChannelTest<Test>::value](samples, flags, count, tests.data());
     };
     switch (stride) {
         case 1:

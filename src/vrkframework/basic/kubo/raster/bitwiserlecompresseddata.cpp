@@ -6,9 +6,9 @@
 #include <cstdint>    // SIZE_MAX
 #include <cstring>    // std::memcpy, std::memset
 
+#include "vrkframework/basic/kubo/raster/count32.h"
 #include "vrkframework/basic/kubo/raster/runs/alternatingruns.h"
 #include "vrkframework/basic/kubo/raster/runs/bytesink.h"
-#include "vrkframework/basic/kubo/raster/count32.h"
 #include "vrkframework/basic/kubo/raster/runs/decodedbytes.h"
 #include "vrkframework/basic/kubo/raster/runs/wordscan.h"
 #include "vrkframework/platform/exception.h"

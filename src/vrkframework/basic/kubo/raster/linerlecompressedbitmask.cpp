@@ -9,10 +9,10 @@
 #include <utility>    // std::move
 #include <vector>
 
-#include "vrkframework/basic/kubo/raster/runs/alternatingruns.h"
 #include "vrkframework/basic/kubo/raster/bufferextent.h"
-#include "vrkframework/basic/kubo/raster/runs/bytesink.h"
 #include "vrkframework/basic/kubo/raster/count32.h"
+#include "vrkframework/basic/kubo/raster/runs/alternatingruns.h"
+#include "vrkframework/basic/kubo/raster/runs/bytesink.h"
 #include "vrkframework/basic/kubo/raster/runs/decodedbytes.h"
 #include "vrkframework/basic/kubo/raster/runs/wordscan.h"
 #include "vrkframework/platform/exception.h"

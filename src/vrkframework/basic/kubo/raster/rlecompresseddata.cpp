@@ -5,8 +5,8 @@
 #include <cstdint>    // std::uint16_t, std::uint32_t, std::uint64_t
 #include <cstring>    // std::memcpy
 
-#include "vrkframework/basic/kubo/raster/runs/bytesink.h"
 #include "vrkframework/basic/kubo/raster/count32.h"
+#include "vrkframework/basic/kubo/raster/runs/bytesink.h"
 #include "vrkframework/basic/kubo/raster/runs/decodedbytes.h"
 #include "vrkframework/basic/kubo/raster/runs/wordscan.h"
 #include "vrkframework/platform/exception.h"
