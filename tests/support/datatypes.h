@@ -24,23 +24,9 @@ inline const DataType kPredefinedTypes[] = {
     DataType::TypeC32S, DataType::TypeC32R, DataType::TypeC64U, DataType::TypeC64S,
     DataType::TypeC64R};
 
-template <class T>
-struct Tag {
-    using type = T;
-};
+using typeconv::detail::ForEachComponentType;
 
-template <class F, std::size_t... Index>
-void ForEachComponentTypeIn(const F& f, std::index_sequence<Index...>) {
-    (f(Tag<typeconv::detail::ComponentAt<Index>>{}), ...);
-}
-
-/// Calls f(Tag<T>{}) for every component type T, in dispatch order.
-template <class F>
-void ForEachComponentType(const F& f) {
-    ForEachComponentTypeIn(f, std::make_index_sequence<typeconv::detail::kComponentCount>());
-}
-
-/// Calls f(Tag<T>{}) for the component type T at `index` in dispatch order; does nothing
+/// Calls f(TypeTag<T>{}) for the component type T at `index` in dispatch order; does nothing
 /// for other indexes.
 template <class F>
 void WithComponent(int index, const F& f) {

@@ -8,6 +8,7 @@
 #include <climits>  // CHAR_BIT
 #include <cstddef>  // std::size_t
 #include <type_traits>
+#include <utility>  // std::index_sequence
 
 #include "vrkframework/basic/core/typeconv/typelist.h"
 
@@ -47,6 +48,22 @@ constexpr std::size_t ComponentIndexOf() {
 /// The component type at `Index` of the dispatch order.
 template <std::size_t Index>
 using ComponentAt = typename AtIndex<Index, priv::ComponentTypes>::type;
+
+template <class T>
+struct TypeTag {
+    using type = T;
+};
+
+template <class F, std::size_t... Index>
+void ForEachComponentTypeIn(const F& f, std::index_sequence<Index...>) {
+    (f(TypeTag<ComponentAt<Index>>{}), ...);
+}
+
+/// Calls f(TypeTag<T>{}) for every component type T, in dispatch order.
+template <class F>
+void ForEachComponentType(const F& f) {
+    ForEachComponentTypeIn(f, std::make_index_sequence<kComponentCount>());
+}
 
 template <class T>
 constexpr unsigned int kBitsOf = static_cast<unsigned int>(sizeof(T) * CHAR_BIT);

@@ -4,45 +4,25 @@
 
 #include <algorithm>  // std::all_of, std::min
 
+#include "vrkframework/basic/core/typeconv/componenttraits.h"
 #include "vrkframework/basic/kubo/masks/nodatarequest.h"
 
 namespace kora::kubo {
 namespace detail {
 namespace {
 
-template <class T>
-struct ElementTag {
-    using type = T;
-};
-
-// The element type of a native code. When you add a sample type, change: this switch, the
-// Wider mapping and its marker (nodatastorage.h), and the type sweeps of the mask tests.
+// The kernels of the element type whose real descriptor has `code`; null for codes without
+// one (the complex and unknown ones).
 template <class Make>
 IMaskDecisionImpl* ForElementType(NativeDataTypeCode code, const Make& make) {
-    switch (code) {
-        case NDT_8U:
-            return make(ElementTag<unsigned char>{});
-        case NDT_8S:
-            return make(ElementTag<char>{});
-        case NDT_16U:
-            return make(ElementTag<unsigned short>{});
-        case NDT_16S:
-            return make(ElementTag<short>{});
-        case NDT_32U:
-            return make(ElementTag<unsigned int>{});
-        case NDT_32S:
-            return make(ElementTag<int>{});
-        case NDT_32R:
-            return make(ElementTag<float>{});
-        case NDT_64U:
-            return make(ElementTag<std::uint64_t>{});
-        case NDT_64S:
-            return make(ElementTag<std::int64_t>{});
-        case NDT_64R:
-            return make(ElementTag<double>{});
-        default:
-            return nullptr;
-    }
+    IMaskDecisionImpl* made = nullptr;
+    typeconv::detail::ForEachComponentType([&](auto tag) {
+        using T = typename decltype(tag)::type;
+        if (NativeDataType(typeconv::priv::RealDescriptor<T>()).code == code) {
+            made = make(tag);
+        }
+    });
+    return made;
 }
 
 // A complex type's component: the float layouts are restored, anything else is read as an
