@@ -31,7 +31,7 @@
 
 namespace {
 
-using typeconv::detail::SampleLayout;
+using typeconv::SampleLayout;
 
 using kubo_test::Expected;
 using kubo_test::High;

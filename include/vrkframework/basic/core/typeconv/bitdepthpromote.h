@@ -10,7 +10,7 @@ namespace typeconv {
 /// Static kernels between a packed stream of N-bit unsigned samples and samples of the
 /// integer type T (any type with the traits of an integer component type). Only the layout
 /// <N, T, 0, 0> exists; its stream layout and rules are those of
-/// detail::PackedOperations<N, T, S>.
+/// PackedOperations<N, T, S>.
 template <unsigned int N, class T, unsigned int BitOrder, unsigned int Extension>
 struct BitDepthPromote;
 
@@ -19,12 +19,12 @@ struct BitDepthPromote<N, T, 0, 0> {
     /// Unpacks `count` samples into `samples`, zero-extended whatever the sign of T.
     /// @throws kora::Exception (line 390) when N exceeds the bits of T.
     static void Promote(const unsigned char* packed, T* samples, unsigned int count) {
-        detail::PackedOperations<N, priv::Component<T>, 0>().Promote(packed, samples, count);
+        PackedOperations<N, priv::Component<T>, 0>().Promote(packed, samples, count);
     }
     /// Clears the (count * N + 7) / 8 bytes of the stream, then ORs the samples in.
     /// @throws kora::Exception (line 395) when N exceeds the bits of T.
     static void Pack(const T* samples, unsigned char* packed, unsigned int count) {
-        detail::PackedOperations<N, priv::Component<T>, 1>().Promote(samples, packed, count);
+        PackedOperations<N, priv::Component<T>, 1>().Promote(samples, packed, count);
     }
 };
 

@@ -12,13 +12,12 @@ namespace typeconv {
 /// the rules of Promote<A, B>; the imaginary part is ignored (no magnitude is taken).
 template <class A, class B>
 class KUBO_API Complex2RealPromote
-    : public detail::PromoteOperations<priv::Component<A>, priv::Component<B>,
-                                       detail::SampleLayout::kComplexToReal> {};
+    : public PromoteOperations<priv::Component<A>, priv::Component<B>,
+                               SampleLayout::kComplexToReal> {};
 
 // Instantiated for every pair of component types inside the library.
-#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                        \
-    extern template class KUBO_API                                             \
-        detail::PromoteOperations<A, B, detail::SampleLayout::kComplexToReal>; \
+#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                                   \
+    extern template class KUBO_API PromoteOperations<A, B, SampleLayout::kComplexToReal>; \
     extern template class KUBO_API Complex2RealPromote<A, B>;
 KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_DETAIL_EXTERN_FAMILY)
 #undef KUBO_DETAIL_EXTERN_FAMILY

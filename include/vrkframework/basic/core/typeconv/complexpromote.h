@@ -12,13 +12,11 @@ namespace typeconv {
 /// components of each sample, real part first, follow the rules of Promote<A, B>.
 template <class A, class B>
 class KUBO_API ComplexPromote
-    : public detail::PromoteOperations<priv::Component<A>, priv::Component<B>,
-                                       detail::SampleLayout::kComplex> {};
+    : public PromoteOperations<priv::Component<A>, priv::Component<B>, SampleLayout::kComplex> {};
 
 // Instantiated for every pair of component types inside the library.
-#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                  \
-    extern template class KUBO_API                                       \
-        detail::PromoteOperations<A, B, detail::SampleLayout::kComplex>; \
+#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                             \
+    extern template class KUBO_API PromoteOperations<A, B, SampleLayout::kComplex>; \
     extern template class KUBO_API ComplexPromote<A, B>;
 KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_DETAIL_EXTERN_FAMILY)
 #undef KUBO_DETAIL_EXTERN_FAMILY

@@ -7,7 +7,7 @@
 #include "vrkframework/basic/core/typeconv/typelist.h"  // KUBO_FOR_EACH_PACKED_LAYOUT
 #include "vrkframework/basic/kubo/kuboapi.h"
 
-namespace typeconv::detail {
+namespace typeconv {
 
 /// Implements IPromote between a packed stream of N-bit unsigned samples and samples of
 /// the integer component type T: direction S = 0 unpacks, S = 1 packs. Sample i occupies
@@ -38,6 +38,6 @@ public:
 KUBO_FOR_EACH_PACKED_LAYOUT(KUBO_DETAIL_EXTERN_PACKED)
 #undef KUBO_DETAIL_EXTERN_PACKED
 
-}  // namespace typeconv::detail
+}  // namespace typeconv
 
 #endif  // VRKFRAMEWORK_BASIC_CORE_TYPECONV_PACKEDOPERATIONS_H

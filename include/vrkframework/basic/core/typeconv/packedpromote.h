@@ -14,7 +14,7 @@ namespace typeconv {
 /// kora::kubo::PromoteFactory, deleted through IPromote. When N exceeds the bits of T,
 /// Promote throws what the bit-depth kernel throws.
 template <unsigned int N, class T, unsigned int S>
-class KUBO_API SpecialPromote : public detail::PackedOperations<N, priv::Component<T>, S> {};
+class KUBO_API SpecialPromote : public PackedOperations<N, priv::Component<T>, S> {};
 
 #define KUBO_DETAIL_EXTERN_SPECIAL(N, T)                    \
     extern template class KUBO_API SpecialPromote<N, T, 0>; \

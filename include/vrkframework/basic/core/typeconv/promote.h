@@ -19,12 +19,12 @@ namespace typeconv {
 /// integers convert to the nearest floating value; double to float overflows to infinity.
 /// Create it with new (or through kora::kubo::PromoteFactory) and call it through IPromote.
 template <class A, class B>
-class KUBO_API Promote : public detail::PromoteOperations<priv::Component<A>, priv::Component<B>,
-                                                          detail::SampleLayout::kReal> {};
+class KUBO_API Promote
+    : public PromoteOperations<priv::Component<A>, priv::Component<B>, SampleLayout::kReal> {};
 
 // Instantiated for every pair of component types inside the library.
-#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                                          \
-    extern template class KUBO_API detail::PromoteOperations<A, B, detail::SampleLayout::kReal>; \
+#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                          \
+    extern template class KUBO_API PromoteOperations<A, B, SampleLayout::kReal>; \
     extern template class KUBO_API Promote<A, B>;
 KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_DETAIL_EXTERN_FAMILY)
 #undef KUBO_DETAIL_EXTERN_FAMILY

@@ -5,7 +5,7 @@
 #include "vrkframework/basic/core/typeconv/ipromote.h"
 #include "vrkframework/basic/kubo/kuboapi.h"
 
-namespace typeconv::detail {
+namespace typeconv {
 
 /// How a family walks its buffers.
 enum class SampleLayout {
@@ -15,9 +15,10 @@ enum class SampleLayout {
     kComplexToReal   ///< 2 * count values in, count out: the real components
 };
 
-/// Implements IPromote for source component A, destination component B and a layout.
-/// The public families derive from it; `Promote<A, B>` cannot declare a member function
-/// with its own name, so every family inherits its `Promote` override from here and
+/// Implements IPromote for source component A, destination component B and a layout, for
+/// the ten component types (instantiated inside the library). The public families derive
+/// from it with the component types their parameters stand for; `Promote<A, B>` cannot declare a
+/// member function with its own name, so every family inherits its `Promote` override from here and
 /// clients call it through IPromote.
 template <class A, class B, SampleLayout Layout>
 class KUBO_API PromoteOperations : public IPromote {
@@ -30,6 +31,6 @@ public:
     unsigned int GetOutputBits() const override;
 };
 
-}  // namespace typeconv::detail
+}  // namespace typeconv
 
 #endif  // VRKFRAMEWORK_BASIC_CORE_TYPECONV_PROMOTEOPERATIONS_H

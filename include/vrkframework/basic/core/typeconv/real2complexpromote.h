@@ -12,13 +12,12 @@ namespace typeconv {
 /// the rules of Promote<A, B>, the imaginary part is 0.
 template <class A, class B>
 class KUBO_API Real2ComplexPromote
-    : public detail::PromoteOperations<priv::Component<A>, priv::Component<B>,
-                                       detail::SampleLayout::kRealToComplex> {};
+    : public PromoteOperations<priv::Component<A>, priv::Component<B>,
+                               SampleLayout::kRealToComplex> {};
 
 // Instantiated for every pair of component types inside the library.
-#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                        \
-    extern template class KUBO_API                                             \
-        detail::PromoteOperations<A, B, detail::SampleLayout::kRealToComplex>; \
+#define KUBO_DETAIL_EXTERN_FAMILY(A, B)                                                   \
+    extern template class KUBO_API PromoteOperations<A, B, SampleLayout::kRealToComplex>; \
     extern template class KUBO_API Real2ComplexPromote<A, B>;
 KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_DETAIL_EXTERN_FAMILY)
 #undef KUBO_DETAIL_EXTERN_FAMILY

@@ -38,15 +38,18 @@ struct Factory2Template {
     }
 };
 
-namespace detail {
+/// Used by ExtendDispatchTypes: types[position]; a vector too short for it is reported
+/// (kora::Exception "Not enough type in the vector for the dispatcher you are using.") at
+/// `shortLine`, with `function` as the function text. Out of line, so no caller's compiler
+/// sees an index past a short literal list.
+KUBO_API const kora::kubo::DataType& DispatchedDescriptor(
+    const std::vector<kora::kubo::DataType>& types, std::size_t position, unsigned int shortLine,
+    const char* function);
+/// Used by ExtendDispatchTypes: reports a descriptor that matches no candidate
+/// (kora::Exception "Invalid type requested.", line 175).
+[[noreturn]] KUBO_API void ThrowUnmatchedDescriptor(const char* function);
 
-/// Returns types[position]; a vector too short for it is reported (kora::Exception) at
-/// `shortLine`. Out of line, so no caller's compiler sees an index past a short literal list.
-KUBO_API const kora::kubo::DataType& DescriptorAt(const std::vector<kora::kubo::DataType>& types,
-                                                  std::size_t position, unsigned int shortLine,
-                                                  const char* function);
-/// Reports a descriptor that matches no candidate (kora::Exception, line 175).
-[[noreturn]] KUBO_API void ThrowInvalidType(const char* function);
+namespace detail {
 
 /// True when `type` equals T's real descriptor or, if accepted, its complex one.
 template <class T>
@@ -91,7 +94,7 @@ struct ExtendDispatchTypes<Factory, N, FullList, typeconv::priv::TypeList<Head, 
                                                  bool acceptComplex) {
         constexpr bool kLastCandidate = std::is_same_v<Tail, typeconv::priv::NullDataType>;
         const kora::kubo::DataType& type =
-            detail::DescriptorAt(types, static_cast<std::size_t>(N - 1),
+            DispatchedDescriptor(types, static_cast<std::size_t>(N - 1),
                                  kLastCandidate ? 163u : 114u, KUBO_DETAIL_DISPATCH_SIGNATURE);
         if (detail::Matches<Head>(type, acceptComplex)) {
             using NowChosen = typeconv::priv::TypeList<Head, Chosen>;
@@ -103,7 +106,7 @@ struct ExtendDispatchTypes<Factory, N, FullList, typeconv::priv::TypeList<Head, 
             }
         }
         if constexpr (kLastCandidate) {
-            detail::ThrowInvalidType(KUBO_DETAIL_DISPATCH_SIGNATURE);
+            ThrowUnmatchedDescriptor(KUBO_DETAIL_DISPATCH_SIGNATURE);
         } else {
             return ExtendDispatchTypes<Factory, N, FullList, Tail, Chosen>::Dispatch(types,
                                                                                      acceptComplex);

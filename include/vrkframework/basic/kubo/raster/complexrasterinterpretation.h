@@ -11,24 +11,6 @@
 #include "vrkframework/platform/interpretation.h"
 
 namespace kora::kubo {
-namespace detail {
-
-/// Implements the worker of the component type T (see ComplexInterpretation::InnerProcessor).
-template <class T>
-class KUBO_API ComplexProcessor : public IRasterInterpretation {
-public:
-    void InterpretRaster(const Raster* in, Raster* out,
-                         kora::core::KORAInterpretationTypes type) const override;
-    Raster* InterpretRaster(const Raster* in,
-                            kora::core::KORAInterpretationTypes type) const override;
-};
-
-#define KUBO_DETAIL_EXTERN_COMPLEX_PROCESSOR(T) extern template class KUBO_API ComplexProcessor<T>;
-KUBO_FOR_EACH_COMPONENT_TYPE(KUBO_DETAIL_EXTERN_COMPLEX_PROCESSOR)
-#undef KUBO_DETAIL_EXTERN_COMPLEX_PROCESSOR
-
-}  // namespace detail
-
 /// Applies an interpretation function f(real, imaginary) to every (real, imaginary) pair of
 /// a complex raster, margins included, and stores the results as 32-bit floats.
 ///
@@ -47,6 +29,10 @@ public:
     ///   extent) or the output's does not hold the input's samples, before writing.
     template <class T>
     class InnerProcessor;
+    /// The worker of the component type T (one of the ten) that InnerProcessor<T> is for
+    /// every type with T's traits.
+    template <class T>
+    class ComponentProcessor;
 
     /// No worker yet.
     ComplexInterpretation();
@@ -91,10 +77,20 @@ private:
 };
 
 template <class T>
-class KUBO_API ComplexInterpretation::InnerProcessor
-    : public detail::ComplexProcessor<typeconv::priv::Component<T>> {};
+class KUBO_API ComplexInterpretation::ComponentProcessor : public IRasterInterpretation {
+public:
+    void InterpretRaster(const Raster* in, Raster* out,
+                         kora::core::KORAInterpretationTypes type) const override;
+    Raster* InterpretRaster(const Raster* in,
+                            kora::core::KORAInterpretationTypes type) const override;
+};
 
-#define KUBO_DETAIL_EXTERN_INNER_PROCESSOR(T) \
+template <class T>
+class KUBO_API ComplexInterpretation::InnerProcessor
+    : public ComponentProcessor<typeconv::priv::Component<T>> {};
+
+#define KUBO_DETAIL_EXTERN_INNER_PROCESSOR(T)                                    \
+    extern template class KUBO_API ComplexInterpretation::ComponentProcessor<T>; \
     extern template class KUBO_API ComplexInterpretation::InnerProcessor<T>;
 KUBO_FOR_EACH_COMPONENT_TYPE(KUBO_DETAIL_EXTERN_INNER_PROCESSOR)
 #undef KUBO_DETAIL_EXTERN_INNER_PROCESSOR

@@ -9,30 +9,16 @@
 #include "vrkframework/basic/kubo/raster/ipromotefactory.h"
 
 namespace kora::kubo {
-namespace detail {
-
-/// Implements the inner factory of the integer component type T: creates the packed
-/// converters typeconv::SpecialPromote<n, T, S>; none for float and double.
-template <class T>
-class KUBO_API PackedPromoteFactory : public IPromoteFactory {
-public:
-    /// n = from.bits, unpacking, unless `from` is whole-byte and `to` a packed integer
-    /// descriptor: then n = to.bits, packing. Returns new SpecialPromote<n, T, 0 or 1>
-    /// for n in 1..31 except 8 and 16; null otherwise and always for float and double.
-    typeconv::IPromote* Create(const DataType& from, const DataType& to) const override;
-};
-
-#define KUBO_DETAIL_EXTERN_PACKED_FACTORY(T) extern template class KUBO_API PackedPromoteFactory<T>;
-KUBO_FOR_EACH_COMPONENT_TYPE(KUBO_DETAIL_EXTERN_PACKED_FACTORY)
-#undef KUBO_DETAIL_EXTERN_PACKED_FACTORY
-
-}  // namespace detail
-
 /// Chooses, creates and returns the converter between two sample types. Holds no data.
 class KUBO_API PromoteFactory : public IPromoteFactory {
 public:
-    /// Creates the packed converters between N-bit streams and element type T
-    /// (typeconv::SpecialPromote<N, T, S>); float and double create none.
+    /// The inner factory of the component type T (one of the ten): creates the packed
+    /// converters between N-bit streams and T (typeconv::SpecialPromote<N, T, S>); float
+    /// and double create none.
+    template <class T>
+    class PackedFactory;
+    /// The inner factory of any sample type T with the traits of a component type: the
+    /// PackedFactory of that component type.
     template <class T>
     class InnerFactory;
 
@@ -62,13 +48,20 @@ public:
     typeconv::IPromote* Create(const DataType& from, const DataType& to) const override;
 };
 
-/// The inner factory of any sample type T with the traits of a component type; see
-/// detail::PackedPromoteFactory.
 template <class T>
-class KUBO_API PromoteFactory::InnerFactory
-    : public detail::PackedPromoteFactory<typeconv::priv::Component<T>> {};
+class KUBO_API PromoteFactory::PackedFactory : public IPromoteFactory {
+public:
+    /// n = from.bits, unpacking, unless `from` is whole-byte and `to` a packed integer
+    /// descriptor: then n = to.bits, packing. Returns new SpecialPromote<n, T, 0 or 1>
+    /// for n in 1..31 except 8 and 16; null otherwise and always for float and double.
+    typeconv::IPromote* Create(const DataType& from, const DataType& to) const override;
+};
 
-#define KUBO_DETAIL_EXTERN_INNER_FACTORY(T) \
+template <class T>
+class KUBO_API PromoteFactory::InnerFactory : public PackedFactory<typeconv::priv::Component<T>> {};
+
+#define KUBO_DETAIL_EXTERN_INNER_FACTORY(T)                          \
+    extern template class KUBO_API PromoteFactory::PackedFactory<T>; \
     extern template class KUBO_API PromoteFactory::InnerFactory<T>;
 KUBO_FOR_EACH_COMPONENT_TYPE(KUBO_DETAIL_EXTERN_INNER_FACTORY)
 #undef KUBO_DETAIL_EXTERN_INNER_FACTORY

@@ -5,8 +5,8 @@
 
 namespace typeconv {
 
-#define KUBO_DETAIL_INSTANTIATE_FAMILY(A, B)                                        \
-    template class detail::PromoteOperations<A, B, detail::SampleLayout::kComplex>; \
+#define KUBO_DETAIL_INSTANTIATE_FAMILY(A, B)                        \
+    template class PromoteOperations<A, B, SampleLayout::kComplex>; \
     template class ComplexPromote<A, B>;
 KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_DETAIL_INSTANTIATE_FAMILY)
 #undef KUBO_DETAIL_INSTANTIATE_FAMILY

@@ -5,10 +5,10 @@
 
 namespace typeconv {
 
-#define KUBO_DETAIL_INSTANTIATE_PACKED(N, T)          \
-    template class detail::PackedOperations<N, T, 0>; \
-    template class detail::PackedOperations<N, T, 1>; \
-    template class SpecialPromote<N, T, 0>;           \
+#define KUBO_DETAIL_INSTANTIATE_PACKED(N, T)  \
+    template class PackedOperations<N, T, 0>; \
+    template class PackedOperations<N, T, 1>; \
+    template class SpecialPromote<N, T, 0>;   \
     template class SpecialPromote<N, T, 1>;
 KUBO_FOR_EACH_PACKED_LAYOUT(KUBO_DETAIL_INSTANTIATE_PACKED)
 #undef KUBO_DETAIL_INSTANTIATE_PACKED

@@ -10,8 +10,8 @@
 
 namespace typeconv {
 
-#define KUBO_DETAIL_INSTANTIATE_FAMILY(A, B)                                     \
-    template class detail::PromoteOperations<A, B, detail::SampleLayout::kReal>; \
+#define KUBO_DETAIL_INSTANTIATE_FAMILY(A, B)                     \
+    template class PromoteOperations<A, B, SampleLayout::kReal>; \
     template class Promote<A, B>;
 KUBO_FOR_EACH_COMPONENT_PAIR(KUBO_DETAIL_INSTANTIATE_FAMILY)
 #undef KUBO_DETAIL_INSTANTIATE_FAMILY

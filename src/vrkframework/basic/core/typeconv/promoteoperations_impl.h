@@ -5,25 +5,25 @@
 #include "vrkframework/basic/core/typeconv/conversionkernels.h"
 #include "vrkframework/basic/core/typeconv/promoteoperations.h"
 
-namespace typeconv::detail {
+namespace typeconv {
 
 template <class A, class B, SampleLayout Layout>
 void PromoteOperations<A, B, Layout>::Promote(const void* src, void* dst, unsigned int count) {
-    CheckBuffers(src, dst, count);
-    RunPromote(ActiveKernels(), Layout, ComponentIndexOf<A>(), ComponentIndexOf<B>(), src, dst,
-               count);
+    detail::CheckBuffers(src, dst, count);
+    detail::RunPromote(detail::ActiveKernels(), Layout, detail::ComponentIndexOf<A>(),
+                       detail::ComponentIndexOf<B>(), src, dst, count);
 }
 
 template <class A, class B, SampleLayout Layout>
 unsigned int PromoteOperations<A, B, Layout>::GetInputBits() const {
-    return kBitsOf<A>;
+    return detail::kBitsOf<A>;
 }
 
 template <class A, class B, SampleLayout Layout>
 unsigned int PromoteOperations<A, B, Layout>::GetOutputBits() const {
-    return kBitsOf<B>;
+    return detail::kBitsOf<B>;
 }
 
-}  // namespace typeconv::detail
+}  // namespace typeconv
 
 #endif  // VRKFRAMEWORK_BASIC_CORE_TYPECONV_PROMOTEOPERATIONS_IMPL_H

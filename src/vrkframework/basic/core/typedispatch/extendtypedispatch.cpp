@@ -3,16 +3,16 @@
 
 #include "vrkframework/platform/exception.h"
 
-namespace kora::typedispatch::detail {
+namespace kora::typedispatch {
 namespace {
 
 constexpr char kSourcePath[] = "vrkframework/basic/core/typedispatch/extendtypedispatch";
 
 }  // namespace
 
-const kora::kubo::DataType& DescriptorAt(const std::vector<kora::kubo::DataType>& types,
-                                         std::size_t position, unsigned int shortLine,
-                                         const char* function) {
+const kora::kubo::DataType& DispatchedDescriptor(const std::vector<kora::kubo::DataType>& types,
+                                                 std::size_t position, unsigned int shortLine,
+                                                 const char* function) {
     if (types.size() <= position) {
         throw kora::Exception("Not enough type in the vector for the dispatcher you are using.",
                               kSourcePath, function, shortLine);
@@ -20,8 +20,8 @@ const kora::kubo::DataType& DescriptorAt(const std::vector<kora::kubo::DataType>
     return types[position];
 }
 
-void ThrowInvalidType(const char* function) {
+void ThrowUnmatchedDescriptor(const char* function) {
     throw kora::Exception("Invalid type requested.", kSourcePath, function, 175);
 }
 
-}  // namespace kora::typedispatch::detail
+}  // namespace kora::typedispatch

@@ -125,8 +125,8 @@ const IRasterInterpretation& ComplexInterpretation::Processor(const DataType& ty
 }
 
 template <class T>
-void detail::ComplexProcessor<T>::InterpretRaster(const Raster* in, Raster* out,
-                                                  KORAInterpretationTypes type) const {
+void ComplexInterpretation::ComponentProcessor<T>::InterpretRaster(
+    const Raster* in, Raster* out, KORAInterpretationTypes type) const {
     const InterpretationFunction function = kora::core::FindInterpretation(type);
     if (in != nullptr && out != nullptr) {
         Interpret<T>(function, *in, *out, kIntoSignature);
@@ -134,8 +134,8 @@ void detail::ComplexProcessor<T>::InterpretRaster(const Raster* in, Raster* out,
 }
 
 template <class T>
-Raster* detail::ComplexProcessor<T>::InterpretRaster(const Raster* in,
-                                                     KORAInterpretationTypes type) const {
+Raster* ComplexInterpretation::ComponentProcessor<T>::InterpretRaster(
+    const Raster* in, KORAInterpretationTypes type) const {
     // The function is looked up before the allocation, so an unknown code leaks nothing.
     const InterpretationFunction function = kora::core::FindInterpretation(type);
     if (in == nullptr) {
@@ -148,8 +148,8 @@ Raster* detail::ComplexProcessor<T>::InterpretRaster(const Raster* in,
     return out.release();
 }
 
-#define KUBO_DETAIL_INSTANTIATE_INNER_PROCESSOR(T) \
-    template class detail::ComplexProcessor<T>;    \
+#define KUBO_DETAIL_INSTANTIATE_INNER_PROCESSOR(T)               \
+    template class ComplexInterpretation::ComponentProcessor<T>; \
     template class ComplexInterpretation::InnerProcessor<T>;
 KUBO_FOR_EACH_COMPONENT_TYPE(KUBO_DETAIL_INSTANTIATE_INNER_PROCESSOR)
 #undef KUBO_DETAIL_INSTANTIATE_INNER_PROCESSOR

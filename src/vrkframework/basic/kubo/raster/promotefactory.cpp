@@ -14,8 +14,8 @@
 
 namespace kora::kubo {
 
-#define KUBO_DETAIL_INSTANTIATE_INNER_FACTORY(T)    \
-    template class detail::PackedPromoteFactory<T>; \
+#define KUBO_DETAIL_INSTANTIATE_INNER_FACTORY(T)     \
+    template class PromoteFactory::PackedFactory<T>; \
     template class PromoteFactory::InnerFactory<T>;
 KUBO_FOR_EACH_COMPONENT_TYPE(KUBO_DETAIL_INSTANTIATE_INNER_FACTORY)
 #undef KUBO_DETAIL_INSTANTIATE_INNER_FACTORY

@@ -35,9 +35,11 @@ typeconv::IPromote* NewSpecialPromote(unsigned int bits, bool pack, std::index_s
     return kCreators[bits](pack);
 }
 
+}  // namespace detail
+
 template <class T>
-typeconv::IPromote* PackedPromoteFactory<T>::Create(const DataType& from,
-                                                    const DataType& to) const {
+typeconv::IPromote* PromoteFactory::PackedFactory<T>::Create(const DataType& from,
+                                                             const DataType& to) const {
     if constexpr (std::is_floating_point_v<T>) {
         return nullptr;
     } else {
@@ -47,14 +49,13 @@ typeconv::IPromote* PackedPromoteFactory<T>::Create(const DataType& from,
             bits = to.bits;
             pack = true;
         }
-        if (bits == 0 || bits > kLargestPackedBits) {
+        if (bits == 0 || bits > detail::kLargestPackedBits) {
             return nullptr;
         }
-        return NewSpecialPromote<T>(bits, pack, std::make_index_sequence<kLargestPackedBits + 1>());
+        return detail::NewSpecialPromote<T>(
+            bits, pack, std::make_index_sequence<detail::kLargestPackedBits + 1>());
     }
 }
-
-}  // namespace detail
 
 }  // namespace kora::kubo
 
