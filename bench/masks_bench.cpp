@@ -2,9 +2,12 @@
 // against a memcpy of the bytes it must at least move: the raster read and the mask written.
 #include <cstdint>
 #include <cstring>
+#include <functional>
 #include <memory>
+#include <string>
 #include <vector>
 
+#include "machine.h"
 #include "memcpyreference.h"
 #include "vrkframework/basic/kubo/masks/mask.h"
 #include "vrkframework/basic/kubo/masks/maskdecisionbuilder.h"
@@ -44,21 +47,25 @@ std::unique_ptr<Raster> BlockRaster(unsigned int channels, const DataType& type)
     return raster;
 }
 
-void RegisterBuildMask(const char* name, std::shared_ptr<Raster> raster,
+// Registers `run` per kernel variant, timed in milliseconds of real time.
+void RegisterTimed(const std::string& name, const std::function<void(benchmark::State&)>& run) {
+    for (benchmark::internal::Benchmark* registered : kubo_bench::RegisterPerVariant(name, run)) {
+        registered->Unit(benchmark::kMillisecond)->UseRealTime();
+    }
+}
+
+void RegisterBuildMask(const std::string& name, std::shared_ptr<Raster> raster,
                        std::shared_ptr<MaskDecisionBuilder> builder) {
     const std::size_t reference = (raster->byteSize + kMaskBytes) / 2;
     kubo_bench::AddMemcpyReference(reference);
-    benchmark::RegisterBenchmark(name,
-                                 [raster, builder, reference](benchmark::State& state) {
-                                     for (auto _ : state) {
-                                         std::unique_ptr<Mask> mask(builder->BuildMask(*raster));
-                                         benchmark::DoNotOptimize(mask->GetBits());
-                                     }
-                                     state.SetItemsProcessed(state.iterations() * kSide * kSide);
-                                     kubo_bench::CompareWithMemcpy(state, reference);
-                                 })
-        ->Unit(benchmark::kMillisecond)
-        ->UseRealTime();
+    RegisterTimed(name, [raster, builder, reference](benchmark::State& state) {
+        for (auto _ : state) {
+            std::unique_ptr<Mask> mask(builder->BuildMask(*raster));
+            benchmark::DoNotOptimize(mask->GetBits());
+        }
+        state.SetItemsProcessed(state.iterations() * kSide * kSide);
+        kubo_bench::CompareWithMemcpy(state, reference);
+    });
 }
 
 void RegisterPacking() {
@@ -69,19 +76,15 @@ void RegisterPacking() {
     for (std::size_t i = 0; i < pixels; ++i) {
         (*flags)[i] = static_cast<unsigned char>((i / kBlock + i / (kBlock * kSide)) % 2);
     }
-    benchmark::RegisterBenchmark("Mask/pack_flags/8192x8192",
-                                 [flags, reference](benchmark::State& state) {
-                                     const RasterInfo info(kSide, kSide, 1, DataType::Type8U);
-                                     for (auto _ : state) {
-                                         Mask mask(info, RasterContext(), flags->data(), false,
-                                                   false);
-                                         benchmark::DoNotOptimize(mask.GetBits());
-                                     }
-                                     state.SetItemsProcessed(state.iterations() * kSide * kSide);
-                                     kubo_bench::CompareWithMemcpy(state, reference);
-                                 })
-        ->Unit(benchmark::kMillisecond)
-        ->UseRealTime();
+    RegisterTimed("Mask/pack_flags/8192x8192", [flags, reference](benchmark::State& state) {
+        const RasterInfo info(kSide, kSide, 1, DataType::Type8U);
+        for (auto _ : state) {
+            Mask mask(info, RasterContext(), flags->data(), false, false);
+            benchmark::DoNotOptimize(mask.GetBits());
+        }
+        state.SetItemsProcessed(state.iterations() * kSide * kSide);
+        kubo_bench::CompareWithMemcpy(state, reference);
+    });
 }
 
 }  // namespace

@@ -10,6 +10,7 @@
 #include <type_traits>
 #include <vector>
 
+#include "machine.h"
 #include "memcpyreference.h"
 #include "vrkframework/basic/core/typeconv/promote.h"
 #include "vrkframework/basic/core/typeconv/typelist.h"
@@ -65,8 +66,8 @@ void AddConversion(const DataType& from, const DataType& to, std::size_t count) 
     kubo_bench::AddMemcpyReference((inBytes + outBytes) / 2);
     const std::string name = std::string(from.isComplex ? "C" : "") + Label<A>() + "_to_" +
                              (to.isComplex ? "C" : "") + Label<B>();
-    benchmark::RegisterBenchmark(
-        ("convert/" + name + "/" + std::to_string(count)).c_str(),
+    kubo_bench::RegisterPerVariant(
+        "convert/" + name + "/" + std::to_string(count),
         [from, to, count, inBytes, outBytes](benchmark::State& state) {
             // Equal types need no conversion and the factory returns null; the copy is
             // measured through the class itself.
@@ -97,10 +98,9 @@ void AddPacked(unsigned int bits, bool pack, std::size_t count) {
     kubo_bench::AddMemcpyReference((inBytes + outBytes) / 2);
     const DataType packed(bits, false, false, bits, 0, false);
     const DataType whole = typeconv::priv::RealDescriptor<T>();
-    benchmark::RegisterBenchmark(
-        ((pack ? "pack/" : "unpack/") + std::to_string(bits) + "_" + Label<T>() + "/" +
-         std::to_string(count))
-            .c_str(),
+    kubo_bench::RegisterPerVariant(
+        (pack ? "pack/" : "unpack/") + std::to_string(bits) + "_" + Label<T>() + "/" +
+            std::to_string(count),
         [=](benchmark::State& state) {
             const std::unique_ptr<typeconv::IPromote> promote(
                 pack ? kora::kubo::PromoteFactory().Create(whole, packed)

@@ -8,6 +8,8 @@
 #include <string>
 #include <vector>
 
+#include "machine.h"
+
 namespace kubo_bench {
 namespace {
 
@@ -102,6 +104,7 @@ int RunWithMemcpyTable(int argc, char** argv) {
     if (benchmark::ReportUnrecognizedArguments(argc, argv)) {
         return 1;
     }
+    PrintMachine();
     TableReporter reporter;
     benchmark::RunSpecifiedBenchmarks(&reporter);
     benchmark::Shutdown();

@@ -17,8 +17,9 @@ void AddMemcpyReference(std::size_t bytes);
 /// AddMemcpyReference before the runs start. Call it from the benchmark body.
 void CompareWithMemcpy(benchmark::State& state, std::size_t bytes);
 
-/// Runs the registered benchmarks with the console output and then prints one table line
-/// per compared run: time per iteration, the reference time and their ratio.
+/// Prints the machine, runs the registered benchmarks with the console output and then
+/// prints one table line per compared run: time per iteration, the reference time and their
+/// ratio.
 int RunWithMemcpyTable(int argc, char** argv);
 
 }  // namespace kubo_bench

@@ -15,6 +15,18 @@ public:
     virtual unsigned int GetDimension() const = 0;
     /// Returns a new heap copy; the caller owns it.
     virtual ICRS* Clone() const = 0;
+
+protected:
+    ICRS() = default;
+    /// @name Copying
+    ///@{
+
+    /// For implementations, which copy and move as they see fit.
+    ICRS(const ICRS&) = default;
+    ICRS& operator=(const ICRS&) = default;
+    ICRS(ICRS&&) = default;
+    ICRS& operator=(ICRS&&) = default;
+    ///@}
 };
 
 }  // namespace kora::ogc::cs

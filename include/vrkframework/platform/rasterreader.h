@@ -23,6 +23,18 @@ public:
     virtual unsigned int GetChannelCount() const = 0;
     /// Type of one sample.
     virtual const kora::kubo::DataType& GetDataType() const = 0;
+
+protected:
+    IRasterReader() = default;
+    /// @name Copying
+    ///@{
+
+    /// For implementations, which copy and move as they see fit.
+    IRasterReader(const IRasterReader&) = default;
+    IRasterReader& operator=(const IRasterReader&) = default;
+    IRasterReader(IRasterReader&&) = default;
+    IRasterReader& operator=(IRasterReader&&) = default;
+    ///@}
 };
 
 }  // namespace kora::datasources

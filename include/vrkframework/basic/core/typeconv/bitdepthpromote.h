@@ -14,6 +14,7 @@ namespace typeconv {
 template <unsigned int N, class T, unsigned int BitOrder, unsigned int Extension>
 struct BitDepthPromote;
 
+/// The only layout: most significant bit first, no sign extension.
 template <unsigned int N, class T>
 struct BitDepthPromote<N, T, 0, 0> {
     /// Unpacks `count` samples into `samples`, zero-extended whatever the sign of T.

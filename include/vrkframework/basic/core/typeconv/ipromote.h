@@ -4,6 +4,7 @@
 
 #include "vrkframework/basic/kubo/kuboapi.h"
 
+/// The sample conversion kernels and their type lists.
 namespace typeconv {
 
 /// A stateless converter of sample buffers. Converters are created with new (by
@@ -21,10 +22,16 @@ public:
 
 protected:
     IPromote() = default;
+
+    /// @name Copying
+    ///@{
+
+    /// For implementations: converters hold no data.
     IPromote(const IPromote&) = default;
     IPromote& operator=(const IPromote&) = default;
     IPromote(IPromote&&) = default;
     IPromote& operator=(IPromote&&) = default;
+    ///@}
 };
 
 }  // namespace typeconv

@@ -37,6 +37,7 @@
     X(std::int64_t, "__int64", INTEGER, arg)          \
     X(std::uint64_t, "unsigned __int64", INTEGER, arg)
 
+/// The compile-time type lists of the type dispatcher.
 namespace typeconv::priv {
 
 /// Ends a type list; as a list of chosen types it is the empty list.
@@ -45,27 +46,28 @@ struct NullDataType {};
 /// One cell of a compile-time list.
 template <class Head, class Tail>
 struct TypeList {
-    using head = Head;
-    using tail = Tail;
+    using head = Head;  ///< the first type
+    using tail = Tail;  ///< the rest of the list
 };
 
 /// TypeList<T0, TypeList<T1, ... NullDataType>> of the given types.
 template <class... Types>
 struct MakeTypeList {
-    using type = NullDataType;
+    using type = NullDataType;  ///< the list
 };
+/// A list with a first type.
 template <class Head, class... Rest>
 struct MakeTypeList<Head, Rest...> {
-    using type = TypeList<Head, typename MakeTypeList<Rest...>::type>;
+    using type = TypeList<Head, typename MakeTypeList<Rest...>::type>;  ///< the list
 };
 /// A trailing NullDataType ends the list too (lets an X-macro emit "T," items).
 template <>
 struct MakeTypeList<NullDataType> {
-    using type = NullDataType;
+    using type = NullDataType;  ///< the empty list
 };
 
-/// The component types in dispatch (search) order.
 #define KUBO_DETAIL_LIST_ITEM(T, name, kind, unused) T,
+/// The component types in dispatch (search) order.
 using ComponentTypes =
     MakeTypeList<KUBO_COMPONENT_TYPES(KUBO_DETAIL_LIST_ITEM, ) NullDataType>::type;
 #undef KUBO_DETAIL_LIST_ITEM
@@ -91,10 +93,12 @@ constexpr kora::kubo::DataType RealDescriptor() {
 /// when none has them.
 template <class T, class List>
 struct FindComponent {
-    using type = NullDataType;
+    using type = NullDataType;  ///< none found
 };
+/// The search in a list with a first type.
 template <class T, class Head, class Tail>
 struct FindComponent<T, TypeList<Head, Tail>> {
+    /// Head when it has T's traits, else the search in the tail.
     using type =
         std::conditional_t<sizeof(Head) == sizeof(T) &&
                                std::is_signed_v<Head> == std::is_signed_v<T> &&
@@ -109,10 +113,12 @@ struct FindComponent<T, TypeList<Head, Tail>> {
 template <class T>
 struct ComponentOf {
     static_assert(std::is_arithmetic_v<T>, "samples are of an arithmetic type");
+    /// The component type.
     using type = typename FindComponent<T, ComponentTypes>::type;
     static_assert(!std::is_same_v<type, NullDataType>,
                   "no component type has the size, signedness and floatness of T");
 };
+/// The component type a sample type T stands for (see ComponentOf).
 template <class T>
 using Component = typename ComponentOf<T>::type;
 

@@ -16,12 +16,14 @@
 #define KUBO_DETAIL_DISPATCH_SIGNATURE __PRETTY_FUNCTION__
 #endif
 
+/// Run-time choice of a class template instance from sample descriptors.
 namespace kora::typedispatch {
 
 /// Adapts a one-parameter class template: creates `new Template<T0>` as `Interface*`.
 template <template <class> class Template, class InterfaceType>
 struct Factory1Template {
-    using Interface = InterfaceType;
+    using Interface = InterfaceType;  ///< what Create returns
+    /// A new Template<T0>; the caller owns it.
     template <class T0>
     static Interface* Create() {
         return new Template<T0>();
@@ -31,7 +33,8 @@ struct Factory1Template {
 /// Adapts a two-parameter class template: T0 is chosen for position 0, T1 for position 1.
 template <template <class, class> class Template, class InterfaceType>
 struct Factory2Template {
-    using Interface = InterfaceType;
+    using Interface = InterfaceType;  ///< what Create returns
+    /// A new Template<T0, T1>; the caller owns it.
     template <class T0, class T1>
     static Interface* Create() {
         return new Template<T0, T1>();
@@ -86,10 +89,12 @@ struct CreateChosen<Factory, typeconv::priv::TypeList<Head, Tail>, Ordered...>
 template <class Factory, int N, class FullList, class Candidates, class Chosen>
 struct ExtendDispatchTypes;
 
+/// The dispatch with candidates left to try at position N - 1.
 template <class Factory, int N, class FullList, class Head, class Tail, class Chosen>
 struct ExtendDispatchTypes<Factory, N, FullList, typeconv::priv::TypeList<Head, Tail>, Chosen> {
     static_assert(N >= 1, "a dispatch resolves at least one position");
 
+    /// See ExtendDispatchTypes.
     static typename Factory::Interface* Dispatch(const std::vector<kora::kubo::DataType>& types,
                                                  bool acceptComplex) {
         constexpr bool kLastCandidate = std::is_same_v<Tail, typeconv::priv::NullDataType>;

@@ -43,6 +43,7 @@ public:
     /// Takes every member, history and CRS included; `other` is left without a CRS.
     ControlPointContainer(ControlPointContainer&& other) noexcept;
     /// As copy assignment: the target keeps its history, and its CRS when `other` has none.
+    // NOLINTNEXTLINE(bugprone-exception-escape,performance-noexcept-move-constructor)
     ControlPointContainer& operator=(ControlPointContainer&& other);
     ~ControlPointContainer();
 

@@ -48,7 +48,9 @@ protected:
     /// owner hands it new ones.
     GroundLocationPolicy(const GroundLocationPolicy& other) noexcept
         : m_populatedAxesCode(other.m_populatedAxesCode) {}
-    GroundLocationPolicy& operator=(const GroundLocationPolicy& other) noexcept {
+    // Safe for self-assignment: only the code is copied, never a pointer.
+    GroundLocationPolicy& operator=(  // NOLINT(bugprone-unhandled-self-assignment)
+        const GroundLocationPolicy& other) noexcept {
         m_populatedAxesCode = other.m_populatedAxesCode;
         return *this;
     }

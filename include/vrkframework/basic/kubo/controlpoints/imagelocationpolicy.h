@@ -34,7 +34,10 @@ protected:
     /// Copies nothing: the arrays are the owner's, and a copy's own owner hands it new
     /// ones.
     ImageLocationPolicy(const ImageLocationPolicy&) noexcept {}
-    ImageLocationPolicy& operator=(const ImageLocationPolicy&) noexcept { return *this; }
+    ImageLocationPolicy& operator=(  // NOLINT(bugprone-unhandled-self-assignment): copies nothing
+        const ImageLocationPolicy&) noexcept {
+        return *this;
+    }
     ///@}
 
     ~ImageLocationPolicy() = default;

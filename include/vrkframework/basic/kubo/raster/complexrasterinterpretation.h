@@ -79,8 +79,10 @@ private:
 template <class T>
 class KUBO_API ComplexInterpretation::ComponentProcessor : public IRasterInterpretation {
 public:
+    /// See InnerProcessor.
     void InterpretRaster(const Raster* in, Raster* out,
                          kora::core::KORAInterpretationTypes type) const override;
+    /// See InnerProcessor.
     Raster* InterpretRaster(const Raster* in,
                             kora::core::KORAInterpretationTypes type) const override;
 };

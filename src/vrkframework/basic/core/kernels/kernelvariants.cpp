@@ -8,11 +8,6 @@
 namespace kora::kubo::detail {
 namespace {
 
-#define KUBO_DETAIL_VARIANT_NAME(name, supported) #name,
-constexpr std::array<const char*, kKernelVariantCount> kNames = {
-    {KUBO_FOR_EACH_KERNEL_VARIANT(KUBO_DETAIL_VARIANT_NAME)}};
-#undef KUBO_DETAIL_VARIANT_NAME
-
 // The processor's answer for every variant, asked once.
 std::array<bool, kKernelVariantCount> AskProcessor() {
 #define KUBO_DETAIL_VARIANT_SUPPORT(name, supported) static_cast<bool>(supported),
@@ -53,7 +48,7 @@ std::atomic<KernelVariant>& InUse() {
 
 }  // namespace
 
-const char* KernelVariantName(KernelVariant variant) { return kNames[variant]; }
+const char* KernelVariantName(KernelVariant variant) { return kKernelVariantNames[variant]; }
 
 bool IsKernelVariantSupported(KernelVariant variant) {
     return variant < kKernelVariantCount && Support()[variant];

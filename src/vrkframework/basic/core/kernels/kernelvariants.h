@@ -4,7 +4,8 @@
 #ifndef VRKFRAMEWORK_BASIC_CORE_KERNELS_KERNELVARIANTS_H
 #define VRKFRAMEWORK_BASIC_CORE_KERNELS_KERNELVARIANTS_H
 
-#include <cstddef>  // std::size_t
+#include <cstddef>   // std::size_t
+#include <iterator>  // std::size
 
 #include "vrkframework/basic/core/kernels/kerneltables.h"
 
@@ -14,11 +15,15 @@ namespace kora::kubo::detail {
 /// fewer processors and faster.
 using KernelVariant = std::size_t;
 
-#define KUBO_DETAIL_COUNT_VARIANT(name, supported) +1
+#define KUBO_DETAIL_VARIANT_NAME(name, supported) #name,
+/// The names of the variants, as test and benchmark names show them ("baseline", "avx2",
+/// ...), slowest first.
+inline constexpr const char* kKernelVariantNames[] = {
+    KUBO_FOR_EACH_KERNEL_VARIANT(KUBO_DETAIL_VARIANT_NAME)};
+#undef KUBO_DETAIL_VARIANT_NAME
+
 /// Number of variants this build compiles.
-constexpr std::size_t kKernelVariantCount =
-    0 KUBO_FOR_EACH_KERNEL_VARIANT(KUBO_DETAIL_COUNT_VARIANT);
-#undef KUBO_DETAIL_COUNT_VARIANT
+constexpr std::size_t kKernelVariantCount = std::size(kKernelVariantNames);
 
 /// The variant's name, as test and benchmark names show it ("baseline", "avx2", ...).
 const char* KernelVariantName(KernelVariant variant);

@@ -102,7 +102,8 @@ std::size_t UnpackWords(const unsigned char* __restrict packed, T* __restrict sa
     const std::size_t windowed = SamplesWithWholeWindow(count, bits);
     const std::size_t end = count < PerWord ? 0 : std::min(windowed, count - PerWord + 1);
     std::size_t done = 0;
-    for (std::size_t position = 0; done < end; done += PerWord, position += PerWord * bits) {
+    for (std::size_t position = 0; done < end;
+         done += PerWord, position += std::size_t{PerWord} * bits) {
         std::uint64_t word = LoadHighFirst(packed + position / 8) << (position % 8);
         for (unsigned int j = 0; j < PerWord; ++j) {
             samples[done + j] = static_cast<T>(word >> (64 - bits));

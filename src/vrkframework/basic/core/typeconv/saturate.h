@@ -46,8 +46,11 @@ template <class B, class A>
 inline B ClampToRange(A x) {
     constexpr bool kClampHigh = static_cast<std::uint64_t>(std::numeric_limits<B>::max()) <
                                 static_cast<std::uint64_t>(std::numeric_limits<A>::max());
-    constexpr bool kClampLow = static_cast<std::int64_t>(std::numeric_limits<B>::lowest()) >
-                               static_cast<std::int64_t>(std::numeric_limits<A>::lowest());
+    // Sign extension of the lowest values is the point of the comparison.
+    constexpr bool kClampLow =
+        static_cast<std::int64_t>(
+            std::numeric_limits<B>::lowest()) >  // NOLINT(bugprone-signed-char-misuse)
+        static_cast<std::int64_t>(std::numeric_limits<A>::lowest());
     if constexpr (kClampHigh) {
         constexpr A kHigh = static_cast<A>(std::numeric_limits<B>::max());
         x = x > kHigh ? kHigh : x;
@@ -76,10 +79,11 @@ inline B ClampHighKeepLowBits(std::int64_t x) {
 
 template <class B, class A>
 inline B IntegerToInteger(A x) {
-    if constexpr (sizeof(A) == sizeof(B) && std::is_signed_v<A> == std::is_signed_v<B>) {
+    // The same bits for the same width and sign, and for 64-bit signed into unsigned (a bit
+    // copy: negatives become large).
+    if constexpr ((sizeof(A) == sizeof(B) && std::is_signed_v<A> == std::is_signed_v<B>) ||
+                  (kIsSigned64<A> && kIsUnsigned64<B>)) {
         return static_cast<B>(x);
-    } else if constexpr (kIsSigned64<A> && kIsUnsigned64<B>) {
-        return static_cast<B>(x);  // a bit copy: negatives become large
     } else if constexpr (kIsSigned64<A>) {
         return ClampHighKeepLowBits<B>(x);
     } else if constexpr (kIsNarrowSigned<A> && sizeof(B) == 8) {

@@ -23,6 +23,8 @@ ControlPointContainer& ControlPointContainer::operator=(const ControlPointContai
 
 ControlPointContainer::ControlPointContainer(ControlPointContainer&& other) noexcept = default;
 
+// It checks the CRS as copy assignment does, so it may throw.
+// NOLINTNEXTLINE(bugprone-exception-escape,performance-noexcept-move-constructor)
 ControlPointContainer& ControlPointContainer::operator=(ControlPointContainer&& other) {
     Copy(other);
     return *this;

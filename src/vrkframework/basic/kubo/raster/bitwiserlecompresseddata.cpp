@@ -91,7 +91,9 @@ BitwiseRLECompressedData::BitwiseRLECompressedData(unsigned char* buffer, Raster
 BitwiseRLECompressedData::BitwiseRLECompressedData(const BitwiseRLECompressedData& other) = default;
 BitwiseRLECompressedData& BitwiseRLECompressedData::operator=(
     const BitwiseRLECompressedData& other) = default;
+// Moving copies: the source stays usable, and the shared data is not duplicated.
 BitwiseRLECompressedData::BitwiseRLECompressedData(BitwiseRLECompressedData&& other) noexcept
+    // NOLINTNEXTLINE(performance-move-constructor-init)
     : BitwiseRLECompressedData(static_cast<const BitwiseRLECompressedData&>(other)) {}
 BitwiseRLECompressedData& BitwiseRLECompressedData::operator=(
     BitwiseRLECompressedData&& other) noexcept {

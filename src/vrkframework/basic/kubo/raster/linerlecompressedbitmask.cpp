@@ -186,7 +186,9 @@ LineRLECompressedBitMask::LineRLECompressedBitMask(Raster& raster)
 LineRLECompressedBitMask::LineRLECompressedBitMask(const LineRLECompressedBitMask& other) = default;
 LineRLECompressedBitMask& LineRLECompressedBitMask::operator=(
     const LineRLECompressedBitMask& other) = default;
+// Moving copies: the source stays usable, and the shared data is not duplicated.
 LineRLECompressedBitMask::LineRLECompressedBitMask(LineRLECompressedBitMask&& other) noexcept
+    // NOLINTNEXTLINE(performance-move-constructor-init)
     : LineRLECompressedBitMask(static_cast<const LineRLECompressedBitMask&>(other)) {}
 LineRLECompressedBitMask& LineRLECompressedBitMask::operator=(
     LineRLECompressedBitMask&& other) noexcept {

@@ -99,7 +99,9 @@ Raster& Raster::operator=(const Raster& other) {
     return *this;
 }
 
+// The description records are plain values: copying them is moving them.
 Raster::Raster(Raster&& other) noexcept
+    // NOLINTNEXTLINE(performance-move-constructor-init)
     : RasterInfo(other),
       RasterContext(other),
       lineStride(other.lineStride),

@@ -149,7 +149,9 @@ RLECompressedData::RLECompressedData(unsigned char* buffer, RasterInfo& info,
 
 RLECompressedData::RLECompressedData(const RLECompressedData& other) = default;
 RLECompressedData& RLECompressedData::operator=(const RLECompressedData& other) = default;
+// Moving copies: the source stays usable, and the shared data is not duplicated.
 RLECompressedData::RLECompressedData(RLECompressedData&& other) noexcept
+    // NOLINTNEXTLINE(performance-move-constructor-init)
     : RLECompressedData(static_cast<const RLECompressedData&>(other)) {}
 RLECompressedData& RLECompressedData::operator=(RLECompressedData&& other) noexcept {
     return *this = static_cast<const RLECompressedData&>(other);
@@ -206,7 +208,7 @@ void RLECompressedData::Decode(unsigned char* out) const {
                 detail::StoreLowFirst(out, ValuesOfFour(four));
                 const unsigned int singles = others == 0 ? 4 : detail::LowestSetBit(others) / 16;
                 out += singles;
-                pair += 2 * singles;
+                pair += std::size_t{2} * singles;
                 if (singles == 4) {
                     continue;
                 }
