@@ -278,9 +278,11 @@ Raster MakeRaster(kubo_fuzz::FuzzInput& input, const std::vector<double>& palett
                   std::mt19937& random) {
     const DataType type = PickType(input);
     const unsigned int channels = 1 + input.Take(6);
-    const bool large = input.Take(8) == 7;  // more pixels than one piece of the builder
-    const unsigned int width = large ? 40 + input.Take(40) : input.Take(9);
-    const unsigned int height = large ? 40 + input.Take(20) : input.Take(6);
+    // Now and then just more pixels than one piece of the builder (2048), so that pieces
+    // meet inside the raster.
+    const bool large = input.Take(16) == 15;
+    const unsigned int width = large ? 2040 + input.Take(40) : input.Take(9);
+    const unsigned int height = large ? 1 + input.Take(2) : input.Take(6);
     const unsigned int hits = input.Take(9);
     Raster raster(RasterInfo(width, height, channels, type),
                   RasterContext(input.Take(3), input.Take(3), input.Take(5), input.Take(5)));

@@ -30,7 +30,7 @@ constexpr char kAreaSignature[] =
     "int,unsigned int)";
 // Cuts into more tiles are not made (only those past 4294967295, which must fail at once),
 // and windows with more boundary points are not asked for theirs: memory stays bounded.
-constexpr std::uint64_t kMostTiles = 100000;
+constexpr std::uint64_t kMostTiles = 10000;
 constexpr double kMostPoints = 50000;
 
 // Mostly 0 to 40 or within 40 of 4294967295, otherwise any 32-bit value.

@@ -356,16 +356,16 @@ TEST(Promote, NullBuffersAreRefusedWhenThereAreSamples) {
     float buffer[4] = {};
     for (typeconv::IPromote* promote :
          std::initializer_list<typeconv::IPromote*>{&real, &complex, &unpack}) {
-        for (const auto& [src, dst] : {std::pair<const void*, void*>{nullptr, buffer},
-                                       std::pair<const void*, void*>{buffer, nullptr}}) {
-            const auto failure =
-                kubo_test::Catch<kora::DataException>([&] { promote->Promote(src, dst, 1); });
+        for (const auto& buffers : {std::pair<const void*, void*>{nullptr, buffer},
+                                    std::pair<const void*, void*>{buffer, nullptr}}) {
+            const auto failure = kubo_test::Catch<kora::DataException>(
+                [&] { promote->Promote(buffers.first, buffers.second, 1); });
             ASSERT_TRUE(failure.has_value());
             kubo_test::ExpectReport(
                 *failure, "A conversion buffer is NULL.",
                 "vrkframework/basic/core/typeconv/promote",
                 "void __cdecl typeconv::IPromote::Promote(const void *,void *,unsigned int)", 0);
-            promote->Promote(src, dst, 0);
+            promote->Promote(buffers.first, buffers.second, 0);
         }
     }
 }
