@@ -279,24 +279,64 @@ public:
             throw py::value_error("array must have the shape (rows, columns), not " +
                                   std::to_string(samples.shape.size()) + " dimensions");
         }
-        height_ = static_cast<std::uint64_t>(samples.shape[0]);
-        width_ = static_cast<std::uint64_t>(samples.shape[1]);
-        layout_.arrayShape = samples.shape;
-        layout_.dtype = py::dtype::of<bool>();
-        layout_.height = height_;
-        layout_.width = width_;
-        if (height_ > INT_MAX || width_ > INT_MAX) {
-            throw py::value_error(
-                "array is too large: windows address at most 2147483647 rows "
-                "and columns");
-        }
+        SetShape(static_cast<std::uint64_t>(samples.shape[0]),
+                 static_cast<std::uint64_t>(samples.shape[1]), "array");
         const Samples rows = samples.IsLastAxisContiguous() ? samples : ContiguousCopy(samples);
         py::gil_scoped_release release;
-        data_ = std::make_unique<LineRLECompressedBitMask>(static_cast<unsigned int>(width_),
-                                                           static_cast<unsigned int>(height_));
         for (std::uint64_t row = 0; row < height_; ++row) {
             data_->CompressRow(rows.data + static_cast<py::ssize_t>(row) * rows.strides[0],
                                static_cast<unsigned long>(row));
+        }
+    }
+
+    // The mask whose rows hold `runs` (the rows' runs one after another, `rowSizes[row]`
+    // bytes each): the inverse of bytes() and row_sizes. The library takes rows as flags
+    // only, so each row's runs are spread into a row of flags and compressed again; runs
+    // the library wrote come out the same.
+    PyLineMask(long long columns, const py::buffer& runs, const py::object& rowSizes) {
+        if (columns < 0) {
+            throw py::value_error("columns must not be negative");
+        }
+        const py::array_t<std::uint64_t, py::array::c_style | py::array::forcecast> sizes(rowSizes);
+        if (sizes.ndim() != 1) {
+            throw py::value_error("row_sizes must be 1-D, one count of bytes a row");
+        }
+        const py::buffer_info stream = runs.request();
+        if (stream.itemsize != 1 || stream.ndim != 1 ||
+            (stream.size > 1 && stream.strides[0] != 1)) {
+            throw py::type_error("runs must be contiguous bytes (bytes or a 1-D uint8 array)");
+        }
+        SetShape(static_cast<std::uint64_t>(sizes.shape(0)), static_cast<std::uint64_t>(columns),
+                 "columns");
+        const auto* bytes = static_cast<const unsigned char*>(stream.ptr);
+        const std::uint64_t* counts = sizes.data();
+        std::uint64_t total = 0;
+        for (std::uint64_t row = 0; row < height_; ++row) {
+            total += counts[row];
+        }
+        if (total != static_cast<std::uint64_t>(stream.size)) {
+            throw py::value_error("row_sizes add up to " + std::to_string(total) +
+                                  " bytes, runs holds " + std::to_string(stream.size));
+        }
+        std::vector<unsigned char> flags(static_cast<std::size_t>(width_));
+        std::uint64_t at = 0;
+        py::gil_scoped_release release;  // the errors below need no interpreter to be made
+        for (std::uint64_t row = 0; row < height_; ++row) {
+            std::uint64_t column = 0;
+            for (std::uint64_t run = 0; run < counts[row]; ++run) {
+                const unsigned char length = bytes[at + run];
+                if (column + length > width_) {
+                    break;
+                }
+                std::memset(flags.data() + column, static_cast<int>(run % 2), length);
+                column += length;
+            }
+            if (column != width_) {
+                throw py::value_error("the runs of row " + std::to_string(row) +
+                                      " do not cover its " + std::to_string(width_) + " pixels");
+            }
+            at += counts[row];
+            data_->CompressRow(flags.data(), static_cast<unsigned long>(row));
         }
     }
 
@@ -384,6 +424,22 @@ public:
     py::tuple Shape() const { return py::make_tuple(height_, width_); }
 
 private:
+    void SetShape(std::uint64_t height, std::uint64_t width, const char* argument) {
+        if (height > INT_MAX || width > INT_MAX) {
+            throw py::value_error(std::string(argument) +
+                                  " is too large: windows address at most 2147483647 rows "
+                                  "and columns");
+        }
+        height_ = height;
+        width_ = width;
+        layout_.arrayShape = {static_cast<py::ssize_t>(height), static_cast<py::ssize_t>(width)};
+        layout_.dtype = py::dtype::of<bool>();
+        layout_.height = height;
+        layout_.width = width;
+        data_ = std::make_unique<LineRLECompressedBitMask>(static_cast<unsigned int>(width),
+                                                           static_cast<unsigned int>(height));
+    }
+
     // One byte a pixel, zero clear and anything else set: uint8, int8 or bool.
     static Samples ReadFlags(const py::object& array, const char* argument) {
         if (py::isinstance<py::array>(array) &&
@@ -566,6 +622,49 @@ array : numpy.ndarray
     zero for clear; rows may be strided (each is read where it lies).
 )doc")
         .def(py::init<const py::object&>(), py::arg("array"))
+        .def_static(
+            "from_runs",
+            [](long long columns, const py::buffer& runs, const py::object& rowSizes) {
+                return std::make_unique<PyLineMask>(columns, runs, rowSizes);
+            },
+            py::arg("columns"), py::arg("runs"), py::arg("row_sizes"),
+            R"doc(The mask of ``columns`` pixels a row whose rows hold the given runs.
+
+The inverse of ``bytes(mask)`` and ``mask.row_sizes``: ``from_runs(columns,
+bytes(mask), mask.row_sizes)`` equals ``mask``. Each row is compressed again from
+its flags, so runs the library did not write (zero-length runs inside a row) come
+out in the library's form.
+
+Parameters
+----------
+columns : int
+    Pixels a row.
+runs : bytes-like
+    Every row's runs one after the other.
+row_sizes : array-like of int
+    The number of runs (bytes) of each row.
+
+Returns
+-------
+LineRLECompressedBitMask
+    A new mask of ``len(row_sizes)`` rows.
+
+Raises
+------
+TypeError
+    For runs that are not contiguous bytes.
+ValueError
+    For row sizes that do not add up to the runs, or a row whose runs do not cover
+    exactly ``columns`` pixels.
+)doc")
+        .def(py::pickle(
+            [](const PyLineMask& mask) {
+                return py::make_tuple(mask.Shape()[1], mask.Bytes(), mask.RowSizes());
+            },
+            [](const py::tuple& state) {
+                return std::make_unique<PyLineMask>(state[0].cast<long long>(),
+                                                    state[1].cast<py::buffer>(), state[2]);
+            }))
         .def("decode", &PyLineMask::Decode, py::arg("window") = py::none(),
              (std::string("Decodes the whole mask or a window of it (bool arrays).") + kWindowDoc)
                  .c_str())

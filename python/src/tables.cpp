@@ -110,6 +110,18 @@ Colour ReadColour(py::handle colour) {
     return {rgb[0], rgb[1], rgb[2]};
 }
 
+PCT ReadPct(const py::object& entries) {
+    std::vector<PCT::Entry> table;
+    for (const py::handle entry : entries) {
+        const auto pair = py::reinterpret_borrow<py::sequence>(entry);
+        if (py::len(pair) != 2) {
+            throw py::value_error("an entry is (input, (red, green, blue))");
+        }
+        table.emplace_back(pair[0].cast<double>(), ReadColour(pair[1]));
+    }
+    return PCT(table);
+}
+
 py::tuple ColourTuple(const Colour& colour) { return py::make_tuple(colour.r, colour.g, colour.b); }
 
 py::object ToPython(double value) { return py::float_(value); }
@@ -218,6 +230,9 @@ kubo.ParameterError
                       "float or numpy.ndarray\n    A float, or a new float64 array of the "
                       "values' shape.")
                 .c_str());
+    lutClass.def(py::pickle(
+        [](const LUT& lut) { return lut.GetEntries(); },
+        [](const std::vector<std::pair<double, double>>& entries) { return LUT(entries); }));
     AddTableMembers<LUT>(
         lutClass, &IsClassicLUT,
         "Whether the table has the inputs 0 to 255 and whole outputs from 0 to 255.");
@@ -239,19 +254,7 @@ Raises
 kubo.ParameterError
     For fewer than two entries.
 )doc");
-    pctClass
-        .def(py::init([](const py::object& entries) {
-                 std::vector<PCT::Entry> table;
-                 for (const py::handle entry : entries) {
-                     const auto pair = py::reinterpret_borrow<py::sequence>(entry);
-                     if (py::len(pair) != 2) {
-                         throw py::value_error("an entry is (input, (red, green, blue))");
-                     }
-                     table.emplace_back(pair[0].cast<double>(), ReadColour(pair[1]));
-                 }
-                 return PCT(table);
-             }),
-             py::arg("entries"))
+    pctClass.def(py::init(&ReadPct), py::arg("entries"))
         .def_static(
             "classic",
             [](const py::object& colours) {
@@ -280,6 +283,15 @@ kubo.ParameterError
                       "tuple or numpy.ndarray\n    An (r, g, b) tuple, or a new uint8 array of "
                       "the values' shape plus a last axis of 3.")
                 .c_str());
+    pctClass.def(py::pickle(
+        [](const PCT& pct) {
+            py::list entries;
+            for (const auto& entry : pct.GetEntries()) {
+                entries.append(py::make_tuple(entry.first, ColourTuple(entry.second)));
+            }
+            return entries;
+        },
+        [](const py::list& entries) { return ReadPct(entries); }));
     AddTableMembers<PCT>(pctClass, &IsClassicPCT,
                          "Whether the table has 256 breakpoints with the inputs 0 to 255.");
 }
