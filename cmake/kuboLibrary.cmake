@@ -114,13 +114,17 @@ endfunction()
 #   made of such a set.
 function(kubo_add_objects prefix output)
   cmake_parse_arguments(PARSE_ARGV 2 objects "" "" "OPTIONS")
-  add_library(${prefix}_platform OBJECT ${KUBO_PLATFORM_SOURCES})
-  add_library(${prefix}_sources OBJECT ${KUBO_SOURCES})
+  # The lists name files from the top of the checkout, wherever this is called from.
+  list(TRANSFORM KUBO_PLATFORM_SOURCES PREPEND ${PROJECT_SOURCE_DIR}/ OUTPUT_VARIABLE platform)
+  list(TRANSFORM KUBO_SOURCES PREPEND ${PROJECT_SOURCE_DIR}/ OUTPUT_VARIABLE sources)
+  add_library(${prefix}_platform OBJECT ${platform})
+  add_library(${prefix}_sources OBJECT ${sources})
   set(targets ${prefix}_platform ${prefix}_sources)
   get_property(variants GLOBAL PROPERTY KUBO_KERNEL_VARIANTS)
   foreach(variant IN LISTS variants)
     get_property(flags GLOBAL PROPERTY KUBO_KERNEL_VARIANT_${variant}_FLAGS)
-    add_library(${prefix}_kernels_${variant} OBJECT ${KUBO_VARIANT_TABLES_SOURCE})
+    add_library(${prefix}_kernels_${variant} OBJECT
+      ${PROJECT_SOURCE_DIR}/${KUBO_VARIANT_TABLES_SOURCE})
     target_compile_definitions(${prefix}_kernels_${variant} PRIVATE KUBO_KERNEL_VARIANT=${variant})
     # The kernels never read floating-point exception flags; without that assumption GCC
     # keeps a branch around every selected floating operation and does not vectorise those

@@ -203,29 +203,36 @@ TEST(BitwiseRLECompressedData, ANullBufferIsNotCompressed) {
 }
 
 TEST(BitwiseRLECompressedData, SeekingPastTheLastRunFailsInJumpThenInSeekUntilAReset) {
-    const Bytes bytes = {0x00, 0x0F, 0xFF, 0x81};
-    const BitwiseRLECompressedData data = Compress8U(bytes, 2, 2);
-    // Column -1 of row 0 wraps to a byte offset far past the end.
-    const auto jump = kubo_test::Catch<kora::DataException>([&] { Window(data, -1, 0, 1, 1, 1); });
-    ASSERT_TRUE(jump);
-    kubo_test::ExpectReport(*jump, "Uncompressed index not found.", kSource,
-                            "void __cdecl kora::kubo::BitwiseRLECompressedData::Jump(void) const",
-                            343);
-
-    // The failed jump left the cursor past the last run: seeking on from there fails at
-    // once, also in a copy, which takes the cursor along.
-    const BitwiseRLECompressedData copy(data);
-    for (const BitwiseRLECompressedData* object : {&data, &copy}) {
-        const auto seek =
-            kubo_test::Catch<kora::DataException>([&] { Window(*object, -1, 0, 1, 1, 1); });
-        ASSERT_TRUE(seek);
+    // A short stream, and one long enough for the cursor to skip ahead through its index.
+    for (const auto& [bytes, width] :
+         {std::pair<Bytes, unsigned int>{{0x00, 0x0F, 0xFF, 0x81}, 2},
+          std::pair<Bytes, unsigned int>{kubo_test::NoiseBytes(2000, 12), 1000}}) {
+        const BitwiseRLECompressedData data = Compress8U(bytes, width, 2);
+        // Column -1 of row 0 wraps to a byte offset far past the end.
+        const auto jump =
+            kubo_test::Catch<kora::DataException>([&] { Window(data, -1, 0, 1, 1, 1); });
+        ASSERT_TRUE(jump);
         kubo_test::ExpectReport(
-            *seek, "Uncompressed index not found.", kSource,
-            "void __cdecl kora::kubo::BitwiseRLECompressedData::Seek(unsigned long) const", 318);
+            *jump, "Uncompressed index not found.", kSource,
+            "void __cdecl kora::kubo::BitwiseRLECompressedData::Jump(void) const", 343);
+
+        // The failed jump left the cursor past the last run: seeking on from there fails at
+        // once, also in a copy, which takes the cursor along.
+        const BitwiseRLECompressedData copy(data);
+        for (const BitwiseRLECompressedData* object : {&data, &copy}) {
+            const auto seek =
+                kubo_test::Catch<kora::DataException>([&] { Window(*object, -1, 0, 1, 1, 1); });
+            ASSERT_TRUE(seek);
+            kubo_test::ExpectReport(
+                *seek, "Uncompressed index not found.", kSource,
+                "void __cdecl kora::kubo::BitwiseRLECompressedData::Seek(unsigned long) const",
+                318);
+        }
+        // A window before the cursor resets it.
+        const int w = static_cast<int>(width);
+        EXPECT_EQ(Window(data, 0, 0, w, 2, bytes.size()), bytes);
+        EXPECT_EQ(Window(copy, w - 1, 1, 1, 1, 1), (Bytes{bytes.back()}));
     }
-    // A window before the cursor resets it.
-    EXPECT_EQ(Window(data, 0, 0, 2, 2, 4), bytes);
-    EXPECT_EQ(Window(copy, 1, 1, 1, 1, 1), (Bytes{0x81}));
 }
 
 TEST(BitwiseRLECompressedData, ASeekIntoTheMiddleOfTheLastRunJumpsPastItAndFails) {

@@ -169,11 +169,14 @@ TEST(RLECompressedData, LaterWindowRowsSeekOnTheTotalOfThePairsEntered) {
 }
 
 TEST(RLECompressedData, MultiRowWindowsFollowTheRunningTotalRule) {
-    const unsigned int width = 50;
-    const unsigned int height = 20;
+    // Streams of a few hundred to many thousand pairs, so that windows start their walk
+    // from the stream's index as well as from its start.
+    const unsigned int width = 300;
+    const unsigned int height = 60;
     std::mt19937 random(8);
     for (const Bytes& bytes : {kubo_test::RunBytes(width * height, 9, {0, 1}, 600),
-                               kubo_test::RunBytes(width * height, 10, {7, 8, 9}, 30)}) {
+                               kubo_test::RunBytes(width * height, 10, {7, 8, 9}, 30),
+                               kubo_test::NoiseBytes(width * height, 11)}) {
         const RLECompressedData data = Compress8U(bytes, width, height);
         for (int i = 0; i < 200; ++i) {
             const int x = static_cast<int>(random() % width);
@@ -181,6 +184,12 @@ TEST(RLECompressedData, MultiRowWindowsFollowTheRunningTotalRule) {
             const int w = static_cast<int>(random() % (width - static_cast<unsigned>(x) + 1));
             const int h = static_cast<int>(random() % (height - static_cast<unsigned>(y) + 1));
             EXPECT_EQ(Window(data, x, y, w, h), Reference(data, x, y, w, h));
+        }
+        for (const auto& window :
+             {std::array<int, 4>{-7, -2, 40, 3}, std::array<int, 4>{250, 58, 90, 4},
+              std::array<int, 4>{0, 61, 5, 2}}) {
+            EXPECT_EQ(Window(data, window[0], window[1], window[2], window[3]),
+                      Reference(data, window[0], window[1], window[2], window[3]));
         }
     }
     // Where every pair has the same count the rule gives the plain slice.

@@ -13,6 +13,9 @@
 #include "vrkframework/basic/kubo/raster/rasterinfo.h"
 
 namespace kora::kubo {
+namespace detail {
+class RunCheckpoints;
+}
 
 /// The raw bytes of a raster (no margins) read as a bit stream, most significant bit of
 /// each byte first, and stored as run lengths of one byte each: run k counts bits of
@@ -23,7 +26,8 @@ namespace kora::kubo {
 /// One sample takes (bits + 7) / 8 bytes, whatever the complex flag says. The inherited
 /// RasterInfo part stays zero, except that copies take it from their source.
 ///
-/// Copies share the runs (they never change after construction); the last holder
+/// Copies share the runs (they never change after construction) and a small index into
+/// them that lets the cursor skip ahead to near the bit it seeks; the last holder
 /// releases them. Each object has its own read cursor, which the window decoder moves
 /// although it is const: one object must not be decoded by window from two threads at
 /// once. Moving copies, so the source stays usable.
@@ -88,19 +92,19 @@ private:
     void ResetSeek() const;
     void Jump() const;
     void Seek(std::uint64_t bit) const;
+    void SkipToCheckpoint(std::uint64_t bit) const;
     void EnterUnreadRun() const;
-    void ReadBit(unsigned char* dst, int k) const;
-    void ReadByte(unsigned char* dst) const;
     void Read(std::uint64_t byteOffset, std::uint64_t byteCount, unsigned char* dst) const;
 
     std::shared_ptr<unsigned char> m_buffer;
     std::size_t m_size;
     RasterInfo m_info;
-    mutable std::size_t m_runIndex;     ///< the current run
-    mutable std::uint64_t m_position;   ///< the next bit to read
-    mutable std::uint32_t m_runLength;  ///< length of the current run
-    mutable std::uint32_t m_consumed;   ///< bits of the current run already read
-    mutable bool m_bitValue;            ///< value of the current run's bits
+    std::shared_ptr<const detail::RunCheckpoints> m_checkpoints;  ///< null for short streams
+    mutable std::size_t m_runIndex;                               ///< the current run
+    mutable std::uint64_t m_position;                             ///< the next bit to read
+    mutable std::uint32_t m_runLength;                            ///< length of the current run
+    mutable std::uint32_t m_consumed;  ///< bits of the current run already read
+    mutable bool m_bitValue;           ///< value of the current run's bits
 };
 
 }  // namespace kora::kubo

@@ -12,6 +12,9 @@
 #include "vrkframework/basic/kubo/raster/rasterinfo.h"
 
 namespace kora::kubo {
+namespace detail {
+class RunCheckpoints;
+}
 
 /// The raw bytes of a raster, margins included, as one stream of (count, value) byte
 /// pairs: count 1 to 255 copies of value, in buffer order, with no header and no split
@@ -22,8 +25,9 @@ namespace kora::kubo {
 /// (bits + 7) / 8 bytes, whatever the complex flag says. The inherited RasterInfo part
 /// stays zero, except that copies take it from their source.
 ///
-/// Copies share the compressed bytes (they never change after construction); the last
-/// holder releases them. Moving copies as well, so the source stays usable.
+/// Copies share the compressed bytes (they never change after construction) and a small
+/// index into them that lets a window start its walk near its first row; the last holder
+/// releases them. Moving copies as well, so the source stays usable.
 class KUBO_API RLECompressedData : public ICompressedData {
 public:
     /// Compresses (width + 2 x xMargin) x (height + 2 x yMargin) x channels x
@@ -82,6 +86,7 @@ private:
     std::shared_ptr<unsigned char> m_buffer;
     RasterInfo m_info;
     std::size_t m_size;
+    std::shared_ptr<const detail::RunCheckpoints> m_checkpoints;  ///< null for short streams
 };
 
 }  // namespace kora::kubo

@@ -10,6 +10,7 @@
 #include "vrkframework/basic/kubo/raster/runs/alternatingruns.h"
 #include "vrkframework/basic/kubo/raster/runs/bytesink.h"
 #include "vrkframework/basic/kubo/raster/runs/decodedbytes.h"
+#include "vrkframework/basic/kubo/raster/runs/runcheckpoints.h"
 #include "vrkframework/basic/kubo/raster/runs/wordscan.h"
 #include "vrkframework/platform/exception.h"
 
@@ -118,6 +119,7 @@ void BitwiseRLECompressedData::Compress(unsigned char* buffer, std::uint64_t bit
         sink);
     m_size = sink.Size();
     m_buffer = sink.Release();
+    m_checkpoints = detail::RunCheckpoints::Of(m_buffer.get(), m_size, 1);
 }
 
 std::uint64_t BitwiseRLECompressedData::GetLineSize() const {
@@ -211,6 +213,7 @@ inline void BitwiseRLECompressedData::Seek(std::uint64_t bit) const {
     if (bit < m_position) {
         ResetSeek();
     }
+    SkipToCheckpoint(bit);
     // Nine jumps at once while all of them stay below the bit and inside the stream: the
     // position grows by the rest of this run and the next eight runs, and the value flips
     // nine times.
@@ -247,6 +250,22 @@ inline void BitwiseRLECompressedData::Seek(std::uint64_t bit) const {
     m_bitValue = !m_bitValue;
 }
 
+// The cursor stands where the jumps below would take it: at the start of the last indexed
+// run that starts before the bit, when that run lies ahead. Run k holds bits of value k mod 2.
+inline void BitwiseRLECompressedData::SkipToCheckpoint(std::uint64_t bit) const {
+    if (!m_checkpoints || bit == 0) {
+        return;
+    }
+    const auto checkpoint = m_checkpoints->LastWithin(bit - 1);
+    if (checkpoint.run > m_runIndex) {
+        m_runIndex = checkpoint.run;
+        m_position = checkpoint.total;
+        m_runLength = m_buffer.get()[m_runIndex];
+        m_consumed = 0;
+        m_bitValue = (m_runIndex & 1u) != 0;
+    }
+}
+
 inline void BitwiseRLECompressedData::EnterUnreadRun() const {
     if (m_consumed >= m_runLength) {
         Jump();
@@ -256,41 +275,29 @@ inline void BitwiseRLECompressedData::EnterUnreadRun() const {
     }
 }
 
-inline void BitwiseRLECompressedData::ReadBit(unsigned char* dst, int k) const {
-    EnterUnreadRun();
-    const auto mask = static_cast<unsigned char>(0x80u >> k);
-    *dst = static_cast<unsigned char>(m_bitValue ? *dst | mask : *dst & ~mask);
-    ++m_consumed;
-    ++m_position;
-}
-
-inline void BitwiseRLECompressedData::ReadByte(unsigned char* dst) const {
-    unsigned char byte = 0;
-    for (int k = 0; k < 8; ++k) {
-        ReadBit(&byte, k);
-    }
-    *dst = byte;
-}
-
 inline void BitwiseRLECompressedData::Read(std::uint64_t byteOffset, std::uint64_t byteCount,
                                            unsigned char* dst) const {
     Seek(byteOffset * 8);
-    // Reads stay byte-aligned: whole bytes inside one run go out as a fill, a byte that
-    // straddles runs bit by bit.
-    for (std::uint64_t i = 0; i < byteCount;) {
-        EnterUnreadRun();
-        const std::uint64_t whole =
-            std::min<std::uint64_t>((m_runLength - m_consumed) / 8, byteCount - i);
-        if (whole == 0) {
-            ReadByte(dst + i);
-            ++i;
-            continue;
+    // The bits go out run by run. A run is entered only when a bit of it is read, so the
+    // cursor ends in the run that holds the last bit read, as read bit by bit.
+    BitWriter writer(dst);
+    try {
+        for (std::uint64_t left = byteCount * 8; left > 0;) {
+            EnterUnreadRun();
+            const std::uint32_t unread = m_runLength - m_consumed;
+            // An empty run after a separator (never written by the encoder) still gives a bit.
+            const auto take =
+                static_cast<std::uint32_t>(unread == 0 ? 1 : std::min<std::uint64_t>(unread, left));
+            writer.Put(take, m_bitValue);
+            m_consumed += take;
+            m_position += take;
+            left -= take;
         }
-        std::memset(dst + i, m_bitValue ? 0xFF : 0, whole);
-        m_consumed += static_cast<std::uint32_t>(8 * whole);
-        m_position += 8 * whole;
-        i += whole;
+    } catch (...) {
+        writer.Finish();  // the whole bytes read before the failure are delivered
+        throw;
     }
+    writer.Finish();
 }
 
 }  // namespace kora::kubo

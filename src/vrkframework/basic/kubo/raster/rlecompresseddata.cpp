@@ -8,6 +8,7 @@
 #include "vrkframework/basic/kubo/raster/count32.h"
 #include "vrkframework/basic/kubo/raster/runs/bytesink.h"
 #include "vrkframework/basic/kubo/raster/runs/decodedbytes.h"
+#include "vrkframework/basic/kubo/raster/runs/runcheckpoints.h"
 #include "vrkframework/basic/kubo/raster/runs/wordscan.h"
 #include "vrkframework/platform/exception.h"
 
@@ -118,12 +119,20 @@ public:
         return pair < m_count ? m_pairs[2 * pair + 1] : 0;
     }
 
-    // The counts of the four pairs from `pair` on (all within the stream), summed in the
-    // 16-bit lanes of one word.
-    std::uint32_t SumOfFour(std::size_t pair) const {
-        const std::uint64_t counts = detail::LoadLowFirst(m_pairs + 2 * pair) & kCountBytes;
+    // The sum of the counts of the 4 x `words` pairs from `pair` on (all within the stream;
+    // at most 64 pairs), added in the 16-bit lanes of one word.
+    template <std::size_t words>
+    std::uint32_t SumOf(std::size_t pair) const {
+        std::uint64_t counts = 0;
+        for (std::size_t k = 0; k < words; ++k) {
+            counts += detail::LoadLowFirst(m_pairs + 2 * pair + 8 * k) & kCountBytes;
+        }
         return static_cast<std::uint32_t>((counts * kLaneOnes) >> 48);
     }
+
+    // Whether the block of pairs after `pair` lies in the stream.
+    bool HasBlockAfter(std::size_t pair) const { return pair < m_count && m_count - pair > kBlock; }
+    const unsigned char* At(std::size_t pair) const { return m_pairs + 2 * pair; }
 
 private:
     const unsigned char* m_pairs;
@@ -145,6 +154,7 @@ RLECompressedData::RLECompressedData(unsigned char* buffer, RasterInfo& info,
                                   30);
     }
     m_buffer = EncodePairs(buffer, GetRasterSize(), m_size);
+    m_checkpoints = detail::RunCheckpoints::Of(m_buffer.get(), m_size / 2, 2);
 }
 
 RLECompressedData::RLECompressedData(const RLECompressedData& other) = default;
@@ -252,28 +262,61 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
     const PairStream pairs(m_buffer.get(), m_size);
     std::size_t pair = 0;
     std::uint64_t total = 0;
+    // The counts of the pairs before `pair` while it lies in the stream. The running total
+    // drifts from it by the row rule below, and the drift stays the same while seeking.
+    std::uint64_t passed = 0;
     for (std::size_t o = 0; h > 0 && o < capacity; --h, o += rowBytes, start += stride) {
-        // Seek: add counts until the total passes the row's start, four pairs at a time
-        // while all four stay at or below it. Past the stream nothing is added.
+        // Seek: add counts until the total passes the row's start. Whole stretches of
+        // pairs go at once while the total stays at or below it: first up to the last
+        // checkpoint that keeps it so, then sixteen, then four pairs at a time. Past the
+        // stream nothing is added.
+        if (m_checkpoints && total <= start && pair < pairs.Size()) {
+            const std::uint64_t room = start - total;
+            const auto checkpoint =
+                m_checkpoints->LastWithin(passed > UINT64_MAX - room ? UINT64_MAX : passed + room);
+            if (checkpoint.run > pair) {
+                total += checkpoint.total - passed;
+                passed = checkpoint.total;
+                pair = checkpoint.run;
+            }
+        }
         while (total <= start && pair < pairs.Size()) {
-            if (pairs.Size() - pair >= 4 && total + pairs.SumOfFour(pair) <= start) {
-                total += pairs.SumOfFour(pair);
+            std::uint64_t count;
+            if (pairs.Size() - pair >= 16 && total + pairs.SumOf<4>(pair) <= start) {
+                count = pairs.SumOf<4>(pair);
+                pair += 16;
+            } else if (pairs.Size() - pair >= 4 && total + pairs.SumOf<1>(pair) <= start) {
+                count = pairs.SumOf<1>(pair);
                 pair += 4;
             } else {
-                total += pairs.Count(pair++);
+                count = pairs.Count(pair++);
             }
+            total += count;
+            passed += count;
         }
         // The step back is taken on every row, also when the seek added nothing.
         --pair;
         std::uint64_t remaining = total - start;
         unsigned char value = pairs.Value(pair);
         total -= pairs.Count(pair);
+        passed -= pairs.Count(pair);
 
         unsigned char* row = out + o;
         for (std::size_t left = std::min(rowBytes, capacity - o); left > 0;) {
             if (remaining == 0) {
+                // Noise: a block of pairs of count 1 entered at once.
+                if (left >= kBlock && pairs.HasBlockAfter(pair) &&
+                    DecodeSingles(pairs.At(pair + 1), row)) {
+                    passed += pairs.Count(pair) + (kBlock - 1);
+                    total += kBlock;
+                    pair += kBlock;
+                    row += kBlock;
+                    left -= kBlock;
+                    continue;
+                }
                 // The total grows by the count of the pair entered (not of the one left):
                 // the next row's seek is defined on that total.
+                passed += pairs.Count(pair);
                 remaining = pairs.Count(++pair);
                 value = pairs.Value(pair);
                 total += remaining;
