@@ -12,6 +12,9 @@ points (:class:`ControlPointContainer`). Failures of the library raise
 
 Complex integer samples (C8U to C64S) have no numpy dtype: they are held in
 integer arrays with a last axis of length 2 (real, imaginary).
+
+Two submodules are imported on their own: :mod:`kubo.dask` (the functions on dask
+arrays, chunk by chunk) and :mod:`kubo.io` (raster files as dask arrays, through GDAL).
 """
 
 from ._kubo import (
