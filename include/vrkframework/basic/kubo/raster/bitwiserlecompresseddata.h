@@ -14,7 +14,7 @@
 
 namespace kora::kubo {
 namespace detail {
-class RunCheckpoints;
+class LazyRunCheckpoints;
 }
 
 /// The raw bytes of a raster (no margins) read as a bit stream, most significant bit of
@@ -26,11 +26,11 @@ class RunCheckpoints;
 /// One sample takes (bits + 7) / 8 bytes, whatever the complex flag says. The inherited
 /// RasterInfo part stays zero, except that copies take it from their source.
 ///
-/// Copies share the runs (they never change after construction) and a small index into
-/// them that lets the cursor skip ahead to near the bit it seeks; the last holder
-/// releases them. Each object has its own read cursor, which the window decoder moves
-/// although it is const: one object must not be decoded by window from two threads at
-/// once. Moving copies, so the source stays usable.
+/// Copies share the runs (they never change after construction) and an index into them
+/// (8 bytes per KiB of runs, made by the first window decode) from which the cursor skips
+/// ahead to near the bit it seeks; the last holder releases them. Each object has its own read
+/// cursor, which the window decoder moves although it is const: one object must not be decoded by
+/// window from two threads at once. Moving copies, so the source stays usable.
 class KUBO_API BitwiseRLECompressedData : public ICompressedData {
 public:
     /// Compresses width x height x channels x ((bits + 7) / 8) bytes of `buffer`; the
@@ -99,10 +99,10 @@ private:
     std::shared_ptr<unsigned char> m_buffer;
     std::size_t m_size;
     RasterInfo m_info;
-    std::shared_ptr<const detail::RunCheckpoints> m_checkpoints;  ///< null for short streams
-    mutable std::size_t m_runIndex;                               ///< the current run
-    mutable std::uint64_t m_position;                             ///< the next bit to read
-    mutable std::uint32_t m_runLength;                            ///< length of the current run
+    std::shared_ptr<detail::LazyRunCheckpoints> m_checkpoints;  ///< made by the first window decode
+    mutable std::size_t m_runIndex;                             ///< the current run
+    mutable std::uint64_t m_position;                           ///< the next bit to read
+    mutable std::uint32_t m_runLength;                          ///< length of the current run
     mutable std::uint32_t m_consumed;  ///< bits of the current run already read
     mutable bool m_bitValue;           ///< value of the current run's bits
 };

@@ -13,7 +13,7 @@
 
 namespace kora::kubo {
 namespace detail {
-class RunCheckpoints;
+class LazyRunCheckpoints;
 }
 
 /// The raw bytes of a raster, margins included, as one stream of (count, value) byte
@@ -25,9 +25,10 @@ class RunCheckpoints;
 /// (bits + 7) / 8 bytes, whatever the complex flag says. The inherited RasterInfo part
 /// stays zero, except that copies take it from their source.
 ///
-/// Copies share the compressed bytes (they never change after construction) and a small
-/// index into them that lets a window start its walk near its first row; the last holder
-/// releases them. Moving copies as well, so the source stays usable.
+/// Copies share the compressed bytes (they never change after construction) and an index
+/// into them (8 bytes per KiB of pairs, made by the first window decode) from which a
+/// window starts its walk near its first row; the last holder releases them. Moving copies as well,
+/// so the source stays usable.
 class KUBO_API RLECompressedData : public ICompressedData {
 public:
     /// Compresses (width + 2 x xMargin) x (height + 2 x yMargin) x channels x
@@ -86,7 +87,7 @@ private:
     std::shared_ptr<unsigned char> m_buffer;
     RasterInfo m_info;
     std::size_t m_size;
-    std::shared_ptr<const detail::RunCheckpoints> m_checkpoints;  ///< null for short streams
+    std::shared_ptr<detail::LazyRunCheckpoints> m_checkpoints;  ///< made by the first window decode
 };
 
 }  // namespace kora::kubo

@@ -73,6 +73,7 @@ private:
 BitwiseRLECompressedData::BitwiseRLECompressedData(unsigned char* buffer, RasterInfo& info)
     : m_size(0),
       m_info(info),
+      m_checkpoints(std::make_shared<detail::LazyRunCheckpoints>()),
       m_runIndex(0),
       m_position(0),
       m_runLength(0),
@@ -119,7 +120,6 @@ void BitwiseRLECompressedData::Compress(unsigned char* buffer, std::uint64_t bit
         sink);
     m_size = sink.Size();
     m_buffer = sink.Release();
-    m_checkpoints = detail::RunCheckpoints::Of(m_buffer.get(), m_size, 1);
 }
 
 std::uint64_t BitwiseRLECompressedData::GetLineSize() const {
@@ -253,10 +253,10 @@ inline void BitwiseRLECompressedData::Seek(std::uint64_t bit) const {
 // The cursor stands where the jumps below would take it: at the start of the last indexed
 // run that starts before the bit, when that run lies ahead. Run k holds bits of value k mod 2.
 inline void BitwiseRLECompressedData::SkipToCheckpoint(std::uint64_t bit) const {
-    if (!m_checkpoints || bit == 0) {
+    if (bit == 0) {
         return;
     }
-    const auto checkpoint = m_checkpoints->LastWithin(bit - 1);
+    const auto checkpoint = m_checkpoints->Get(m_buffer.get(), m_size, 1).LastWithin(bit - 1);
     if (checkpoint.run > m_runIndex) {
         m_runIndex = checkpoint.run;
         m_position = checkpoint.total;

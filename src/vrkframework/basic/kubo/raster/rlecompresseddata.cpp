@@ -145,7 +145,8 @@ RLECompressedData::RLECompressedData(unsigned char* buffer, RasterInfo& info,
                                      RasterContext& context)
     : m_info(info.width + 2 * context.xMargin, info.height + 2 * context.yMargin, info.channels,
              info.dataType),
-      m_size(0) {
+      m_size(0),
+      m_checkpoints(std::make_shared<detail::LazyRunCheckpoints>()) {
     if (buffer == nullptr) {
         throw kora::DataException("pBuffer is NULL, cannot compress NULL buffer", kSourcePath,
                                   "__cdecl kora::kubo::RLECompressedData::RLECompressedData("
@@ -154,7 +155,6 @@ RLECompressedData::RLECompressedData(unsigned char* buffer, RasterInfo& info,
                                   30);
     }
     m_buffer = EncodePairs(buffer, GetRasterSize(), m_size);
-    m_checkpoints = detail::RunCheckpoints::Of(m_buffer.get(), m_size / 2, 2);
 }
 
 RLECompressedData::RLECompressedData(const RLECompressedData& other) = default;
@@ -260,6 +260,7 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
         pixel;
     const auto rowBytes = static_cast<std::size_t>(w);
     const PairStream pairs(m_buffer.get(), m_size);
+    const detail::RunCheckpoints& checkpoints = m_checkpoints->Get(m_buffer.get(), m_size / 2, 2);
     std::size_t pair = 0;
     std::uint64_t total = 0;
     // The counts of the pairs before `pair` while it lies in the stream. The running total
@@ -270,10 +271,10 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
         // pairs go at once while the total stays at or below it: first up to the last
         // checkpoint that keeps it so, then sixteen, then four pairs at a time. Past the
         // stream nothing is added.
-        if (m_checkpoints && total <= start && pair < pairs.Size()) {
+        if (total <= start && pair < pairs.Size()) {
             const std::uint64_t room = start - total;
             const auto checkpoint =
-                m_checkpoints->LastWithin(passed > UINT64_MAX - room ? UINT64_MAX : passed + room);
+                checkpoints.LastWithin(passed > UINT64_MAX - room ? UINT64_MAX : passed + room);
             if (checkpoint.run > pair) {
                 total += checkpoint.total - passed;
                 passed = checkpoint.total;
