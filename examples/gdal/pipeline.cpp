@@ -3,6 +3,8 @@
 // apart. Per band: the validity mask from the file's no-data value, and the heights
 // stretched to 8 bits (no data 0, low..high onto 1..255) through a LUT and the 64R to 8U
 // converter.
+#include <gdal.h>
+
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
@@ -27,6 +29,9 @@ int main(int argc, char** argv) {
         std::fprintf(stderr, "usage: %s <file> <low> <high>\n", argv[0]);
         return 2;
     }
+    // Each block is read once: a small block cache (GDAL keeps 5 % of the memory by default)
+    // saves filling it with blocks never read again, which took three times the reads here.
+    GDALSetCacheMax64(64 << 20);
     const GdalRasterReader reader(argv[1]);
     const double noData = reader.GetNoData().value_or(0.0);
     const LUT stretch({{noData, 0.0}, {std::atof(argv[2]), 1.0}, {std::atof(argv[3]), 255.0}});

@@ -101,15 +101,18 @@ def _read_window(
     x, y, width, height = window
     dtype, pixel_axes = _pixel_layout(label, bands)
     sample_bytes = gdal.GetDataTypeSize(_GDAL_TYPES[label]) // 8
-    raw = _open(path).ReadRaster(
+    samples = np.empty((height, width) + pixel_axes, dtype)
+    # Read straight into the array: through a bytes object the read took three times as long.
+    _open(path).ReadRaster(
         x, y, width, height,
         buf_type=_GDAL_TYPES[label],
         band_list=list(range(1, bands + 1)),
         buf_pixel_space=bands * sample_bytes,
         buf_line_space=width * bands * sample_bytes,
         buf_band_space=sample_bytes,
+        buf_obj=samples,
     )
-    return np.frombuffer(raw, dtype).reshape((height, width) + pixel_axes)
+    return samples
 
 
 def _read_block(path: str, label: str, bands: int, block_info: dict | None = None) -> np.ndarray:
