@@ -24,6 +24,14 @@ constexpr bool kVector64BitMultiply =
     false;
 #endif
 
+/// Comparisons that write a mask register (one bit a lane) rather than a vector of lanes.
+constexpr bool kCompareIntoMaskRegisters =
+#if defined(__AVX512F__) && defined(__AVX512BW__) && defined(__AVX512VL__)
+    true;
+#else
+    false;
+#endif
+
 /// Rounding of floating lanes toward zero, to whole values.
 constexpr bool kVectorRounding =
 #if defined(__SSE4_1__) || defined(__ARM_NEON)

@@ -6,9 +6,11 @@
 #define VRKFRAMEWORK_BASIC_KUBO_MASKS_MASKLOOPS_IMPL_H
 
 #include <array>
-#include <cstddef>  // std::size_t
-#include <utility>  // std::index_sequence
+#include <cstddef>      // std::size_t
+#include <type_traits>  // std::is_integral_v
+#include <utility>      // std::index_sequence
 
+#include "vrkframework/basic/core/kernels/capabilities.h"
 #include "vrkframework/basic/core/typeconv/componenttraits.h"
 #include "vrkframework/basic/kubo/masks/bkgdrule.h"
 #include "vrkframework/basic/kubo/masks/maskloops.h"
@@ -84,9 +86,16 @@ void PackFlagsLoop(const unsigned char* __restrict flags, unsigned char* __restr
     }
 }
 
+// Where comparisons write mask registers, an integer test's flags go from lanes to a mask
+// register and back to bytes, which measures slower than comparing into lanes: such a
+// variant leaves the integer loops to the variant below it. Floating tests gain.
 template <BkgdRule Rule, std::size_t C, class T>
 constexpr std::array<FlagLoop, 2> FlagLoopsOf() {
-    return {{&FlagLoopOf<Rule, C, T, PlainTest<T>>, &FlagLoopOf<Rule, C, T, ChannelTest<T>>}};
+    if constexpr (kCompareIntoMaskRegisters && std::is_integral_v<T>) {
+        return {};
+    } else {
+        return {{&FlagLoopOf<Rule, C, T, PlainTest<T>>, &FlagLoopOf<Rule, C, T, ChannelTest<T>>}};
+    }
 }
 
 template <BkgdRule Rule, std::size_t C, std::size_t... Index>
