@@ -127,7 +127,7 @@ def _whole_blocks(
     whole blocks (the last chunk of an axis takes what is left)."""
     if isinstance(chunks, str) and chunks == "auto":
         return da.core.normalize_chunks(
-            "auto", shape, limit=8 << 20, dtype=pixel, previous_chunks=block
+            "auto", shape, limit=16 << 20, dtype=pixel, previous_chunks=block
         )
     sizes = (chunks, chunks) if np.ndim(chunks) == 0 else tuple(chunks)
     if len(sizes) != 2 or not all(isinstance(n, (int, np.integer)) and n > 0 for n in sizes):
@@ -145,7 +145,7 @@ def open_raster(path: str | os.PathLike, *, chunks: Any = "auto") -> RasterFile:
     path : str or os.PathLike
         Any raster file GDAL reads (GDAL's ``/vsi...`` paths too).
     chunks : "auto", int or (int, int)
-        "auto" groups the file's blocks into chunks of about 8 MiB; a size (for rows
+        "auto" groups the file's blocks into chunks of about 16 MiB; a size (for rows
         and columns, or each) is rounded to whole blocks.
 
     Returns
