@@ -59,7 +59,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     };
     const long long width = info.width;
     const long long height = info.height;
-    for (int i = 0; i < 16; ++i) {
+    for (int i = 0; i < 6; ++i) {
         const int x = pick(-2, width + 1);
         const int y = pick(-1, height);
         const int w = pick(-1, width + 1);
