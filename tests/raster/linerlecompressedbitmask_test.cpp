@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <numeric>
 #include <random>
 
 #include "support/compressedsamples.h"
@@ -135,6 +137,43 @@ TEST(LineRLECompressedBitMask, WindowsAreSlicesOfTheMask) {
     EXPECT_EQ(out[0], flags.back());
     out[flags.size() - 1] = 0;  // the buffer holds the whole mask
     delete[] out;
+}
+
+// Rows of thousands of runs are decoded from checkpoints inside the row; a window must not
+// tell, wherever it starts: in noise, inside a set run long enough to be split into 255 + 0 +
+// ... pieces, at the row's end or past it.
+TEST(LineRLECompressedBitMask, WindowsFarAlongLongRowsAreSlicesOfTheMask) {
+    const unsigned int width = 40000;
+    const unsigned int height = 3;
+    Bytes flags = Flags(kubo_test::RunBytes(width * height, 9, {0, 1}, 6));
+    std::fill_n(flags.begin() + width + 20000, 3000, 1);
+    const LineRLECompressedBitMask mask = MaskOf(flags, width, height);
+    ASSERT_GT(mask.GetCompressedRowSize(1), 4096u);
+    std::mt19937 random(3);
+    for (int i = 0; i < 400; ++i) {
+        const int x = i == 0 ? 20500 : static_cast<int>(random() % width);
+        const int y = static_cast<int>(random() % height);
+        const int w = static_cast<int>(random() % std::min(300u, width - static_cast<unsigned>(x)));
+        ASSERT_EQ(Window(mask, x, y, w, 1),
+                  kubo_test::Slice(flags, width, static_cast<std::size_t>(x),
+                                   static_cast<std::size_t>(y), static_cast<std::size_t>(w), 1))
+            << x << "," << y;
+    }
+    // Around the pixels where every 1024th run starts.
+    const Bytes runs = Runs(mask, 1);
+    std::size_t start = 0;
+    for (std::size_t run = 0; run + 1024 < runs.size(); run += 1024) {
+        start = std::accumulate(runs.begin() + static_cast<std::ptrdiff_t>(run),
+                                runs.begin() + static_cast<std::ptrdiff_t>(run) + 1024, start);
+        for (const std::size_t x : {start - 1, start, start + 1}) {
+            ASSERT_EQ(Window(mask, static_cast<int>(x), 1, 5, 1),
+                      kubo_test::Slice(flags, width, x, 1, 5, 1))
+                << x;
+        }
+    }
+    EXPECT_EQ(Window(mask, width, 2, 2, 1), (Bytes{0, 0}));
+    Bytes out(1);
+    EXPECT_THROW(mask.Decode(width + 1, 2, 1, 1, out.data()), kora::DataException);
 }
 
 TEST(LineRLECompressedBitMask, PartialRowsStartInsideARun) {

@@ -14,6 +14,7 @@
 #include "vrkframework/basic/kubo/raster/runs/alternatingruns.h"
 #include "vrkframework/basic/kubo/raster/runs/bytesink.h"
 #include "vrkframework/basic/kubo/raster/runs/decodedbytes.h"
+#include "vrkframework/basic/kubo/raster/runs/runcheckpoints.h"
 #include "vrkframework/basic/kubo/raster/runs/wordscan.h"
 #include "vrkframework/platform/exception.h"
 
@@ -38,10 +39,26 @@ struct RunEnd {
     std::uint64_t end;
 };
 
-// The run that holds pixel `start` (> 0): the first whose end reaches it.
-inline RunEnd FindPixel(const unsigned char* runs, std::size_t runCount, std::uint64_t start) {
+/// The runs of one row, and checkpoints into them when the row is long enough to need them.
+struct RowRuns {
+    const unsigned char* runs = nullptr;
+    std::size_t size = 0;
+    const detail::RunCheckpoints* checkpoints = nullptr;
+};
+
+// The run that holds pixel `start` (> 0): the first whose end reaches it. The walk starts at
+// the last checkpoint that ends before the start, where the sum is what the walk from the
+// first run would have there.
+inline RunEnd FindPixel(const RowRuns& row, std::uint64_t start) {
+    const unsigned char* runs = row.runs;
+    const std::size_t runCount = row.size;
     std::size_t run = 0;
     std::uint64_t sum = 0;
+    if (row.checkpoints != nullptr) {
+        const detail::RunCheckpoints::Checkpoint near = row.checkpoints->LastWithin(start - 1);
+        run = near.run;
+        sum = near.total;
+    }
     // Eight runs at once while they all end before the start; once they do not, the
     // start lies within them and needs no bound check.
     for (; runCount - run >= 8; run += 8) {
@@ -65,13 +82,15 @@ inline RunEnd FindPixel(const unsigned char* runs, std::size_t runCount, std::ui
 
 // Writes pixels start to start + count - 1 of a row, one byte (0 or 1) each. Calls stay
 // inside this file, so that they are direct.
-inline void DecodeRuns(const unsigned char* runs, std::size_t runCount, std::uint64_t start,
-                       std::uint64_t count, unsigned char* out) {
+inline void DecodeRuns(const RowRuns& row, std::uint64_t start, std::uint64_t count,
+                       unsigned char* out) {
+    const unsigned char* runs = row.runs;
+    const std::size_t runCount = row.size;
     std::size_t run = 0;
     std::uint64_t length = 0;  // pixels of the current value from `out` on
     bool value = false;
     if (start != 0) {
-        const RunEnd found = FindPixel(runs, runCount, start);
+        const RunEnd found = FindPixel(row, start);
         run = found.next;
         length = found.end - start;  // the rest of the run that holds the start
         value = detail::RunValue(run - 1);
@@ -134,17 +153,26 @@ void CheckRowsReadable(const Raster& raster) {
 
 }  // namespace
 
-/// Where each row's runs are (null while the row is empty) and how many there are.
+/// Where each row's runs are (null while the row is empty), how many there are, and
+/// checkpoints into the long rows, so that a window far to the right starts its walk near its
+/// first pixel.
 struct LineRLECompressedBitMask::RowTable {
-    struct Row {
-        const unsigned char* runs = nullptr;
-        std::size_t size = 0;
-    };
+    using Row = RowRuns;
 
-    explicit RowTable(unsigned int height) : rows(height), owned(height) {}
+    explicit RowTable(unsigned int height) : rows(height), owned(height), checkpoints(height) {}
 
     /// The runs of `row`: none for a row not stored yet or past the last.
     Row Runs(unsigned long row) const { return row < rows.size() ? rows[row] : Row(); }
+
+    /// Makes `row` the `size` runs at `runs`, with checkpoints when it has more than two
+    /// checkpoints' worth of them.
+    void Store(std::size_t row, const unsigned char* runs, std::size_t size) {
+        checkpoints[row].reset();
+        if (size >= 2 * detail::RunCheckpoints::kStreamBytesPerCheckpoint) {
+            checkpoints[row] = std::make_unique<const detail::RunCheckpoints>(runs, size, 1);
+        }
+        rows[row] = {runs, size, checkpoints[row].get()};
+    }
 
     std::vector<Row> rows;
     /// The rows compressed from a raster, back to back, so that rows decoded one after
@@ -152,6 +180,7 @@ struct LineRLECompressedBitMask::RowTable {
     detail::EncodedBytes block;
     /// Rows stored by CompressRow, each in a buffer of its own.
     std::vector<std::unique_ptr<unsigned char[]>> owned;
+    std::vector<std::unique_ptr<const detail::RunCheckpoints>> checkpoints;
 };
 
 LineRLECompressedBitMask::LineRLECompressedBitMask(unsigned int maskWidth, unsigned int maskHeight)
@@ -178,7 +207,7 @@ LineRLECompressedBitMask::LineRLECompressedBitMask(Raster& raster)
     table.block = sink.Release();
     std::size_t begin = 0;
     for (unsigned int row = 0; row < raster.height; ++row) {
-        table.rows[row] = {table.block.get() + begin, ends[row] - begin};
+        table.Store(row, table.block.get() + begin, ends[row] - begin);
         begin = ends[row];
     }
 }
@@ -241,7 +270,7 @@ void LineRLECompressedBitMask::CompressRow(unsigned char* data, unsigned long ro
     }
     std::uint64_t size = 0;
     std::unique_ptr<unsigned char[]> runs = Compress(data, GetRowSize(), size);
-    m_rows->rows[row] = {runs.get(), size};
+    m_rows->Store(row, runs.get(), static_cast<std::size_t>(size));
     m_rows->owned[row] = std::move(runs);  // releases the buffer the row had, if any
 }
 
@@ -261,8 +290,7 @@ void LineRLECompressedBitMask::DecodeRow(unsigned long row, unsigned char* out) 
 
 void LineRLECompressedBitMask::DecodePartialRow(unsigned long row, std::uint64_t start,
                                                 std::uint64_t count, unsigned char* out) const {
-    const RowTable::Row runs = m_rows->Runs(row);
-    DecodeRuns(runs.runs, runs.size, start, count, out);
+    DecodeRuns(m_rows->Runs(row), start, count, out);
 }
 
 unsigned char* LineRLECompressedBitMask::Decode() const {
@@ -284,8 +312,7 @@ void LineRLECompressedBitMask::Decode(unsigned char* out) const {
     }
     const unsigned long rowSize = GetRowSize();
     for (unsigned int row = 0; row < m_info.height; ++row) {
-        const RowTable::Row runs = m_rows->Runs(row);
-        DecodeRuns(runs.runs, runs.size, 0, m_info.width, out + row * rowSize);
+        DecodeRuns(m_rows->Runs(row), 0, m_info.width, out + row * rowSize);
     }
 }
 
@@ -312,8 +339,7 @@ void LineRLECompressedBitMask::DecodeWindow(int x, int y, int w, int h, unsigned
     std::uint64_t o = 0;
     for (long long row = y; row < static_cast<long long>(y) + h && o < capacity;
          ++row, o += spacing) {
-        const RowTable::Row runs = table.Runs(static_cast<std::uint64_t>(row));
-        DecodeRuns(runs.runs, runs.size, static_cast<std::uint64_t>(x),
+        DecodeRuns(table.Runs(static_cast<std::uint64_t>(row)), static_cast<std::uint64_t>(x),
                    std::min(count, capacity - o), out + o);
     }
 }
