@@ -35,9 +35,20 @@ public:
                                      unsigned int stretch = 1) {
         std::vector<unsigned char> bytes(count, 0);
         const std::size_t left = m_size - m_next;
-        for (std::size_t i = 0; i < count && left > 0; ++i) {
-            const unsigned char byte = m_data[m_next + (i / stretch) % left];
-            bytes[i] = mask ? static_cast<unsigned char>((byte & 1u) != 0 ? 0xFF : 0) : byte;
+        if (left == 0) {
+            return bytes;
+        }
+        // Byte i comes from input byte (i / stretch) % left, counted rather than divided:
+        // rasters of a few hundred kilobytes are made for every input.
+        std::size_t from = m_next;
+        unsigned int uses = 0;
+        for (unsigned char& out : bytes) {
+            const unsigned char byte = m_data[from];
+            out = mask ? static_cast<unsigned char>((byte & 1u) != 0 ? 0xFF : 0) : byte;
+            if (++uses == stretch) {
+                uses = 0;
+                from = from + 1 == m_size ? m_next : from + 1;
+            }
         }
         return bytes;
     }
