@@ -56,6 +56,7 @@ void RunConversion(benchmark::State& state, typeconv::IPromote& promote,
     const std::size_t traffic = input.size() + outBytes;
     state.SetBytesProcessed(state.iterations() * static_cast<std::int64_t>(traffic));
     kubo_bench::CompareWithMemcpy(state, traffic / 2);
+    kubo_bench::CompareWithReadAndFill(state, input.data(), input.size(), output.data(), outBytes);
 }
 
 /// Registers the conversion from `from` to `to` (components A and B) at `count` samples.

@@ -23,6 +23,7 @@ set(KUBO_SOURCES
   src/vrkframework/basic/kubo/raster/tileiterator.cpp
   # Kernel variants: the registry that picks the instruction set the kernels run.
   src/vrkframework/basic/core/kernels/kernelvariants.cpp
+  src/vrkframework/basic/core/kernels/processortuning.cpp
   # Type conversion: dispatch, the four element families, packed streams, the factory.
   src/vrkframework/basic/core/typedispatch/extendtypedispatch.cpp
   src/vrkframework/basic/core/typeconv/complex2realpromote.cpp

@@ -7,6 +7,16 @@
 
 namespace kora::kubo::detail {
 
+/// The width of the vectors, in bits.
+constexpr unsigned int kVectorBits =
+#if defined(__AVX512F__)
+    512;
+#elif defined(__AVX2__)
+    256;
+#else
+    128;
+#endif
+
 /// Conversions between floating lanes and unsigned 32-bit or any 64-bit integer lanes, and
 /// min and max of unsigned and 64-bit lanes: there the plain conversions vectorise.
 constexpr bool kWideIntegerConversions =

@@ -14,6 +14,7 @@ namespace kora::kubo::detail {
 struct KernelTables {
     typeconv::detail::KernelSet conversion;
     MaskLoops masks;
+    unsigned int vectorBits;  ///< the width of the variant's vectors
 };
 
 /// Replaces every null entry of `tables` by the one of `before`.

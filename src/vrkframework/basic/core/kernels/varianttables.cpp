@@ -12,7 +12,8 @@ namespace kora::kubo::detail {
 
 #define KUBO_DETAIL_DEFINE_TABLES(name) KUBO_DETAIL_TABLES_FUNCTION(name)
 const KernelTables& KUBO_DETAIL_DEFINE_TABLES(KUBO_KERNEL_VARIANT)() {
-    static constexpr KernelTables kTables = {typeconv::detail::kConversionKernels, kMaskLoops};
+    static constexpr KernelTables kTables = {typeconv::detail::kConversionKernels, kMaskLoops,
+                                             kVectorBits};
     return kTables;
 }
 #undef KUBO_DETAIL_DEFINE_TABLES

@@ -70,13 +70,18 @@ constexpr unsigned int kBitsOf = static_cast<unsigned int>(sizeof(T) * CHAR_BIT)
 
 #define KUBO_DETAIL_SIZE_ITEM(T, name, kind, unused) sizeof(T),
 #define KUBO_DETAIL_NAME_ITEM(T, name, kind, unused) name,
+#define KUBO_DETAIL_INTEGER_ITEM(T, name, kind, unused) std::is_integral_v<T>,
 /// Bytes of each component type, by index.
 constexpr std::array<std::size_t, kComponentCount> kComponentSizes = {
     {KUBO_COMPONENT_TYPES(KUBO_DETAIL_SIZE_ITEM, )}};
 /// The framework's spelling of each component type, as function texts show it.
 constexpr std::array<const char*, kComponentCount> kComponentTypeNames = {
     {KUBO_COMPONENT_TYPES(KUBO_DETAIL_NAME_ITEM, )}};
+/// Whether each component type, by index, is an integer type.
+constexpr std::array<bool, kComponentCount> kComponentIsInteger = {
+    {KUBO_COMPONENT_TYPES(KUBO_DETAIL_INTEGER_ITEM, )}};
 #undef KUBO_DETAIL_SIZE_ITEM
+#undef KUBO_DETAIL_INTEGER_ITEM
 #undef KUBO_DETAIL_NAME_ITEM
 
 }  // namespace typeconv::detail

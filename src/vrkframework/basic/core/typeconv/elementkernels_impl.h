@@ -8,7 +8,6 @@
 #include <cstring>  // std::memcpy
 #include <type_traits>
 
-#include "vrkframework/basic/core/kernels/capabilities.h"
 #include "vrkframework/basic/core/typeconv/conversionkernels.h"
 #include "vrkframework/basic/core/typeconv/saturate.h"
 
@@ -47,22 +46,14 @@ void Copy(const void* src, void* dst, std::size_t count) {
 /// sources into 64-bit integers (negatives to 0) give the same bits for both signs of the
 /// destination and share the unsigned destination's kernel.
 ///
-/// Wide integer conversions bring conversions and clamps of floating values to integers,
-/// conversions of unsigned 32-bit and 64-bit integers to floating values, and integer to
-/// floating widenings that write twice the bytes per instruction. The other kernels only
-/// clamp, widen, narrow or interleave, and the wider vectors that come with those
-/// conversions stream them out of cache slower: a variant with them leaves the others
-/// null, to be taken from the variant before it.
+/// Every variant compiles every pair; a processor family that runs some of them faster
+/// from the variant below takes them from there (processortuning.h).
 template <class A, class B, std::size_t Stride>
 constexpr ConvertKernel SelectConvertKernel() {
-    constexpr bool kConvertsNumberKind = (std::is_floating_point_v<A> && std::is_integral_v<B>) ||
-                                         (std::is_integral_v<A> && std::is_floating_point_v<B>);
     constexpr bool kSameBits =
         sizeof(A) == sizeof(B) && std::is_integral_v<A> && std::is_integral_v<B> &&
         (std::is_signed_v<A> == std::is_signed_v<B> || (std::is_signed_v<A> && sizeof(A) == 8));
-    if constexpr (kWideIntegerConversions && !kConvertsNumberKind) {
-        return nullptr;
-    } else if constexpr ((std::is_same_v<A, B> || kSameBits) && Stride == 1) {
+    if constexpr ((std::is_same_v<A, B> || kSameBits) && Stride == 1) {
         return &Copy<sizeof(A)>;
     } else if constexpr (std::is_same_v<A, B> || kSameBits) {
         return &Convert<UnsignedOfSize<sizeof(A)>, UnsignedOfSize<sizeof(A)>, Stride>;
