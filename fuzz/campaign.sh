@@ -33,7 +33,8 @@ for target in "${targets[@]}"; do
   mkdir -p "build/fuzz/corpus/$target"
   log="build/fuzz/logs/$target.log"
   status=ok
-  if ! "build/fuzz/fuzz/${target}_fuzz" "${options[@]}" -print_final_stats=1 \
+  # One process a target: no other writes to its corpus, so it is never read again.
+  if ! "build/fuzz/fuzz/${target}_fuzz" "${options[@]}" -print_final_stats=1 -reload=0 \
       -artifact_prefix=build/fuzz/artifacts/ "build/fuzz/corpus/$target" \
       "fuzz/corpus/$target" > "$log" 2>&1; then
     status="FAILED (see $log)"

@@ -3,7 +3,8 @@
 #ifndef KUBO_FUZZ_FUZZINPUT_H
 #define KUBO_FUZZ_FUZZINPUT_H
 
-#include <cstddef>  // std::size_t
+#include <algorithm>  // std::fill_n
+#include <cstddef>    // std::size_t
 #include <cstdint>  // std::uint8_t
 #include <cstdio>   // std::fprintf
 #include <cstdlib>  // std::abort
@@ -34,23 +35,28 @@ public:
     std::vector<unsigned char> Bytes(std::size_t count, bool mask = false,
                                      unsigned int stretch = 1) {
         std::vector<unsigned char> bytes(count, 0);
-        const std::size_t left = m_size - m_next;
-        if (left == 0) {
-            return bytes;
+        Fill(bytes.data(), count, mask, stretch);
+        return bytes;
+    }
+
+    /// As Bytes, written to `out`.
+    void Fill(unsigned char* out, std::size_t count, bool mask = false, unsigned int stretch = 1) {
+        if (m_next == m_size) {
+            std::fill_n(out, count, 0);
+            return;
         }
         // Byte i comes from input byte (i / stretch) % left, counted rather than divided:
         // rasters of a few hundred kilobytes are made for every input.
         std::size_t from = m_next;
         unsigned int uses = 0;
-        for (unsigned char& out : bytes) {
+        for (std::size_t i = 0; i < count; ++i) {
             const unsigned char byte = m_data[from];
-            out = mask ? static_cast<unsigned char>((byte & 1u) != 0 ? 0xFF : 0) : byte;
+            out[i] = mask ? static_cast<unsigned char>((byte & 1u) != 0 ? 0xFF : 0) : byte;
             if (++uses == stretch) {
                 uses = 0;
                 from = from + 1 == m_size ? m_next : from + 1;
             }
         }
-        return bytes;
     }
 
 private:
