@@ -5,60 +5,76 @@
 
 #include <algorithm>  // std::upper_bound
 #include <atomic>
-#include <cstddef>   // std::size_t
-#include <cstdint>   // std::uint32_t, std::uint64_t
-#include <iterator>  // std::prev
-#include <memory>    // std::unique_ptr, std::make_unique
+#include <cstddef>  // std::size_t
+#include <cstdint>  // std::uint32_t, std::uint64_t
+#include <memory>   // std::unique_ptr, std::make_unique
 #include <vector>
 
 namespace kora::kubo::detail {
 
-/// The running total of the run counts at every `spacing`-th run of a stream whose runs
-/// take `stride` bytes each, the count in the first; the first checkpoint stands at run 0. A
-/// checkpoint takes 8 bytes per 1 KiB of stream, so the index stays under 1 % of what it indexes;
-/// the walk from a checkpoint to any position covers at most 1 KiB.
+/// Streams index themselves every 1 KiB of runs: 8 bytes of checkpoint per KiB keeps an index
+/// under 1 % of what it indexes, and the walk from a checkpoint to any position covers at
+/// most 1 KiB.
+constexpr std::size_t kStreamBytesPerCheckpoint = 1024;
+
+/// A place in a stream of runs: the index of a run and the sum of the counts before it.
+struct Checkpoint {
+    std::size_t run;
+    std::uint64_t total;
+};
+
+/// The sum of the counts of `count` runs of kStride bytes each. A block's counts fit 32
+/// bits, which lets the sum vectorise.
+template <std::size_t kStride>
+std::uint32_t SumOfCounts(const unsigned char* runs, std::size_t count) {
+    std::uint32_t sum = 0;
+    for (std::size_t run = 0; run < count; ++run) {
+        sum += runs[run * kStride];
+    }
+    return sum;
+}
+
+/// Appends to `totals` the running total of the counts of `runCount` runs of `stride` (1 or
+/// 2) bytes each, the count in the first, at every `spacing`-th run after the first while
+/// runs remain beyond it: totals[b] is the sum of the counts before run (b + 1) x spacing.
+/// That makes (runCount - 1) / spacing totals.
+inline void AppendCheckpointTotals(const unsigned char* runs, std::size_t runCount,
+                                   std::size_t stride, std::size_t spacing,
+                                   std::vector<std::uint64_t>& totals) {
+    std::uint64_t total = 0;
+    for (std::size_t first = 0; runCount - first > spacing; first += spacing) {
+        const unsigned char* block = runs + first * stride;
+        total += stride == 1 ? SumOfCounts<1>(block, spacing) : SumOfCounts<2>(block, spacing);
+        totals.push_back(total);
+    }
+}
+
+/// The last checkpoint of `count` totals (as AppendCheckpointTotals makes them) whose total
+/// is at most `limit`, or the first run when none is.
+inline Checkpoint LastCheckpointWithin(const std::uint64_t* totals, std::size_t count,
+                                       std::size_t spacing, std::uint64_t limit) {
+    const std::size_t after =
+        static_cast<std::size_t>(std::upper_bound(totals, totals + count, limit) - totals);
+    return after == 0 ? Checkpoint{0, 0} : Checkpoint{after * spacing, totals[after - 1]};
+}
+
+/// The checkpoints of a whole stream whose runs take `stride` bytes each.
 class RunCheckpoints {
 public:
-    static constexpr std::size_t kStreamBytesPerCheckpoint = 1024;
-
-    struct Checkpoint {
-        std::size_t run;      ///< index of the run the checkpoint stands at
-        std::uint64_t total;  ///< sum of the counts of the runs before it
-    };
-
     RunCheckpoints(const unsigned char* runs, std::size_t runCount, std::size_t stride)
-        : m_spacing(kStreamBytesPerCheckpoint / stride), m_totals{0} {
-        m_totals.reserve(runCount / m_spacing + 1);
-        std::uint64_t total = 0;
-        for (std::size_t first = 0; runCount - first > m_spacing; first += m_spacing) {
-            const unsigned char* block = runs + first * stride;
-            total +=
-                stride == 1 ? SumOfCounts<1>(block, m_spacing) : SumOfCounts<2>(block, m_spacing);
-            m_totals.push_back(total);
-        }
+        : m_spacing(kStreamBytesPerCheckpoint / stride) {
+        m_totals.reserve(runCount / m_spacing);
+        AppendCheckpointTotals(runs, runCount, stride, m_spacing, m_totals);
     }
 
-    /// The last checkpoint whose total is at most `limit` (the first run's, total 0, at
-    /// least).
+    /// The last checkpoint whose total is at most `limit` (the first run, total 0, at least).
     Checkpoint LastWithin(std::uint64_t limit) const {
-        const auto after = std::upper_bound(m_totals.begin(), m_totals.end(), limit);
-        const auto index = static_cast<std::size_t>(std::prev(after) - m_totals.begin());
-        return {index * m_spacing, m_totals[index]};
+        return LastCheckpointWithin(m_totals.data(), m_totals.size(), m_spacing, limit);
     }
 
 private:
-    // A block's counts fit 32 bits, which lets the sum vectorise.
-    template <std::size_t kStride>
-    static std::uint32_t SumOfCounts(const unsigned char* runs, std::size_t count) {
-        std::uint32_t sum = 0;
-        for (std::size_t run = 0; run < count; ++run) {
-            sum += runs[run * kStride];
-        }
-        return sum;
-    }
-
     std::size_t m_spacing;
-    std::vector<std::uint64_t> m_totals;  ///< m_totals[b]: counts of the runs before b x spacing
+    std::vector<std::uint64_t> m_totals;
 };
 
 /// The checkpoints of a stream, made by the first window decode that needs them, so that
