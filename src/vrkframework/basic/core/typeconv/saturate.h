@@ -164,12 +164,13 @@ constexpr A LargestConvertibleBelow(A limit) {
                : limit - limit * std::numeric_limits<A>::epsilon() / 2;
 }
 
-/// The signed type a clamped A within the 32-bit range truncates through: with wide integer
-/// conversions a double converts to 64-bit lanes, like its own, which narrow faster than
-/// 32-bit ones.
-template <class A>
-using Truncation =
-    std::conditional_t<kWideIntegerConversions && sizeof(A) == 8, std::int64_t, std::int32_t>;
+/// The signed type a clamped A within the 32-bit range truncates through on its way to B:
+/// with wide integer conversions a double bound for 8 or 16 bits converts to 64-bit lanes,
+/// like its own, which narrow faster than 32-bit ones; bound for 32 bits it converts to them
+/// directly, with no narrowing after.
+template <class A, class B>
+using Truncation = std::conditional_t<kWideIntegerConversions && sizeof(A) == 8 && sizeof(B) < 4,
+                                      std::int64_t, std::int32_t>;
 
 /// Truncates c in [0, 2^32).
 template <class A>
@@ -269,7 +270,7 @@ inline B FloatingToNarrowSigned(A x) {
     if constexpr (kWideIntegerConversions) {
         const A y = x + std::copysign(A(0.5), x);
         const A c = ClampOnBits(y, kLow, kCeiling, sizeof(B) < 4 ? A(0) : kLow);
-        const B value = static_cast<B>(static_cast<Truncation<A>>(c));
+        const B value = static_cast<B>(static_cast<Truncation<A, B>>(c));
         if constexpr (kCeiling == kHigh) {
             return value;
         } else {
@@ -302,7 +303,7 @@ inline B FloatingToNarrowUnsigned(A x) {
     const A y = x + A(0.5);
     const A c = ClampMagnitude(y, kCeiling);
     if constexpr (sizeof(B) < 4) {
-        return static_cast<B>(static_cast<Truncation<A>>(c));
+        return static_cast<B>(static_cast<Truncation<A, B>>(c));
     } else if constexpr (kCeiling == kHigh) {
         return TruncateToUInt32(c);
     } else {
