@@ -5,9 +5,9 @@
 
 #include <algorithm>  // std::fill_n
 #include <cstddef>    // std::size_t
-#include <cstdint>  // std::uint8_t
-#include <cstdio>   // std::fprintf
-#include <cstdlib>  // std::abort
+#include <cstdint>    // std::uint8_t
+#include <cstdio>     // std::fprintf
+#include <cstdlib>    // std::abort
 #include <vector>
 
 namespace kubo_fuzz {
