@@ -119,6 +119,32 @@ bool SameEntry(const Entry& a, const Entry& b) {
     return Same(a.first, b.first) && Same(a.second, b.second);
 }
 
+// A key per value that is equal exactly when Same is: every NaN one key, -0 and +0 two.
+std::uint64_t KeyOf(double x) {
+    std::uint64_t bits = 0x7FF8000000000000u;
+    if (!std::isnan(x)) {
+        std::memcpy(&bits, &x, sizeof bits);
+    }
+    return bits;
+}
+
+std::uint64_t KeyOf(const Colour& c) {
+    return c.r | static_cast<std::uint64_t>(c.g) << 8 | static_cast<std::uint64_t>(c.b) << 16;
+}
+
+// The entries' keys in order: two lists hold the same entries (as SameEntry tells them
+// apart) exactly when these are equal, found in n log n where tables reach thousands.
+template <class Entry>
+std::vector<std::pair<std::uint64_t, std::uint64_t>> SortedKeys(const std::vector<Entry>& entries) {
+    std::vector<std::pair<std::uint64_t, std::uint64_t>> keys;
+    keys.reserve(entries.size());
+    for (const Entry& entry : entries) {
+        keys.emplace_back(KeyOf(entry.first), KeyOf(entry.second));
+    }
+    std::sort(keys.begin(), keys.end());
+    return keys;
+}
+
 // Linear interpolation between two breakpoints, in the rule's order of operations.
 double Blend(const LUT::Entry& lower, const LUT::Entry& upper, double x) {
     return (x - lower.first) / (upper.first - lower.first) * (upper.second - lower.second) +
@@ -210,8 +236,7 @@ void CheckTable(Table& table, const std::vector<typename Table::Entry>& given, F
             return a.first > b.first;
         }) != given.end();
     if (unordered) {
-        Check(std::is_permutation(entries.begin(), entries.end(), given.begin(), SameEntry<Entry>),
-              "sorting keeps the breakpoints");
+        Check(SortedKeys(entries) == SortedKeys(given), "sorting keeps the breakpoints");
         for (std::size_t i = 1; i < n; ++i) {
             Check(!(entries[i].first < entries[i - 1].first) &&
                       (std::isnan(entries[i].first) || !std::isnan(entries[i - 1].first)),
