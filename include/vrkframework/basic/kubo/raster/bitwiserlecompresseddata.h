@@ -15,7 +15,16 @@
 namespace kora::kubo {
 namespace detail {
 class LazyRunCheckpoints;
-}
+
+/// Where a bit-run stream's read cursor stands.
+struct BitRunCursor {
+    std::size_t runIndex;     ///< the current run
+    std::uint64_t position;   ///< the next bit to read
+    std::uint32_t runLength;  ///< length of the current run
+    std::uint32_t consumed;   ///< bits of the current run already read
+    bool bitValue;            ///< value of the current run's bits
+};
+}  // namespace detail
 
 /// The raw bytes of a raster (no margins) read as a bit stream, most significant bit of
 /// each byte first, and stored as run lengths of one byte each: run k counts bits of
@@ -88,23 +97,11 @@ private:
     std::uint64_t GetBufferSizeBytes() const;
     void DecodeWindow(int x, int y, int w, int h, unsigned char* out, std::size_t capacity) const;
 
-    // The read cursor.
-    void ResetSeek() const;
-    void Jump() const;
-    void Seek(std::uint64_t bit) const;
-    void SkipToCheckpoint(std::uint64_t bit) const;
-    void EnterUnreadRun() const;
-    void Read(std::uint64_t byteOffset, std::uint64_t byteCount, unsigned char* dst) const;
-
     std::shared_ptr<unsigned char> m_buffer;
     std::size_t m_size;
     RasterInfo m_info;
     std::shared_ptr<detail::LazyRunCheckpoints> m_checkpoints;  ///< made by the first window decode
-    mutable std::size_t m_runIndex;                             ///< the current run
-    mutable std::uint64_t m_position;                           ///< the next bit to read
-    mutable std::uint32_t m_runLength;                          ///< length of the current run
-    mutable std::uint32_t m_consumed;  ///< bits of the current run already read
-    mutable bool m_bitValue;           ///< value of the current run's bits
+    mutable detail::BitRunCursor m_cursor;
 };
 
 }  // namespace kora::kubo

@@ -18,7 +18,12 @@ namespace kora::kubo {
 namespace {
 
 constexpr char kSourcePath[] = "vrkframework/basic/kubo/raster/bitwiserlecompresseddata";
-constexpr char kIndexNotFound[] = "Uncompressed index not found.";
+
+// Out of line, so that the cursor's steps stay small enough to inline into the window loop.
+[[noreturn]] void ThrowIndexNotFound(const char* function, unsigned int line) {
+    throw kora::DataException("Uncompressed index not found.", kSourcePath, function, line);
+}
+
 constexpr char kWindowDecode[] =
     "void __cdecl kora::kubo::BitwiseRLECompressedData::Decode(int,int,int,int,unsigned char *) "
     "const";
@@ -68,17 +73,158 @@ private:
     unsigned int m_filled = 0;
 };
 
+using Cursor = detail::BitRunCursor;
+
+// The read cursor at work. It moves a copy of the object's cursor, which the compiler keeps
+// in registers (the members themselves would make a round trip through memory at every run,
+// since the bytes written may alias them), and the window decoder stores it back at the end,
+// also when a read fails.
+class Reader {
+public:
+    Reader(const unsigned char* runs, std::size_t size, detail::LazyRunCheckpoints& checkpoints,
+           const Cursor& cursor)
+        : m_runs(runs), m_size(size), m_checkpoints(checkpoints), m_cursor(cursor) {}
+
+    /// The cursor at the first bit of a stream.
+    static Cursor Start(const unsigned char* runs) { return Cursor{0, 0, runs[0], 0, false}; }
+
+    const Cursor& Where() const { return m_cursor; }
+
+    void Read(std::uint64_t byteOffset, std::uint64_t byteCount, unsigned char* dst) {
+        Seek(byteOffset * 8);
+        // The bits go out run by run. A run is entered only when a bit of it is read, so the
+        // cursor ends in the run that holds the last bit read, as read bit by bit. Runs that
+        // a separator joins go out as one stretch.
+        BitWriter writer(dst);
+        std::uint64_t stretch = 0;
+        try {
+            for (std::uint64_t left = byteCount * 8; left > 0;) {
+                EnterUnreadRun();
+                const std::uint32_t unread = m_cursor.runLength - m_cursor.consumed;
+                // An empty run after a separator (never written by the encoder) still gives a
+                // bit.
+                const auto take = static_cast<std::uint32_t>(
+                    unread == 0 ? 1 : std::min<std::uint64_t>(unread, left));
+                stretch += take;
+                m_cursor.consumed += take;
+                m_cursor.position += take;
+                left -= take;
+                // The value goes on when the run ends at a separator that is not the last run.
+                const bool goesOn = left > 0 && m_cursor.consumed == m_cursor.runLength &&
+                                    m_cursor.runIndex + 2 < m_size &&
+                                    m_runs[m_cursor.runIndex + 1] == 0;
+                if (!goesOn) {
+                    writer.Put(stretch, m_cursor.bitValue);
+                    stretch = 0;
+                }
+            }
+        } catch (...) {
+            writer.Finish();  // the whole bytes read before the failure are delivered
+            throw;
+        }
+        writer.Finish();
+    }
+
+private:
+    void Jump() {
+        m_cursor.position += m_cursor.runLength - m_cursor.consumed;
+        ++m_cursor.runIndex;
+        if (m_cursor.runIndex >= m_size) {
+            ThrowIndexNotFound(
+                "void __cdecl kora::kubo::BitwiseRLECompressedData::Jump(void) const", 343);
+        }
+        EnterRun(m_cursor.runIndex, m_cursor.position, !m_cursor.bitValue);
+    }
+
+    void EnterRun(std::size_t run, std::uint64_t position, bool value) {
+        m_cursor.runIndex = run;
+        m_cursor.position = position;
+        m_cursor.runLength = m_runs[run];
+        m_cursor.consumed = 0;
+        m_cursor.bitValue = value;
+    }
+
+    // kRuns + 1 jumps at once while all of them stay below the bit and inside the stream: the
+    // position grows by the rest of this run and the next kRuns runs.
+    template <std::size_t kRuns, class Sum>
+    void JumpBlocks(std::uint64_t bit, Sum sumOfRuns) {
+        while (m_cursor.runIndex + kRuns + 1 < m_size) {
+            const std::uint64_t next = m_cursor.position +
+                                       (m_cursor.runLength - m_cursor.consumed) +
+                                       sumOfRuns(m_runs + m_cursor.runIndex + 1);
+            if (next >= bit) {
+                break;
+            }
+            EnterRun(m_cursor.runIndex + kRuns + 1, next,
+                     m_cursor.bitValue != ((kRuns + 1) % 2 == 1));
+        }
+    }
+
+    void Seek(std::uint64_t bit) {
+        if (bit < m_cursor.position) {
+            m_cursor = Start(m_runs);
+        }
+        SkipToCheckpoint(bit);
+        JumpBlocks<64>(bit, [](const unsigned char* runs) {
+            return std::uint64_t{detail::SumOfCounts<1>(runs, 64)};
+        });
+        JumpBlocks<8>(bit, detail::SumOfEightBytes);
+        while (m_cursor.position < bit && m_cursor.runIndex < m_size) {
+            Jump();
+        }
+        // Reached only when an earlier failed jump left the cursor past the last run.
+        if (m_cursor.runIndex >= m_size) {
+            ThrowIndexNotFound(
+                "void __cdecl kora::kubo::BitwiseRLECompressedData::Seek(unsigned long) const",
+                318);
+        }
+        if (m_cursor.position == bit) {
+            return;
+        }
+        // The last jump passed the bit: step back into the run that holds it.
+        --m_cursor.runIndex;
+        m_cursor.runLength = m_runs[m_cursor.runIndex];
+        m_cursor.consumed =
+            static_cast<std::uint32_t>(m_cursor.runLength - (m_cursor.position - bit));
+        m_cursor.position = bit;
+        m_cursor.bitValue = !m_cursor.bitValue;
+    }
+
+    // The cursor stands where the jumps would take it: at the start of the last indexed run
+    // that starts before the bit, when that run lies ahead. Run k holds bits of value k mod 2.
+    void SkipToCheckpoint(std::uint64_t bit) {
+        if (bit == 0) {
+            return;
+        }
+        const auto checkpoint =
+            m_checkpoints.Get(m_runs, m_size, 1).LastWithin(bit - 1, m_cursor.runIndex);
+        if (checkpoint.run > m_cursor.runIndex) {
+            EnterRun(checkpoint.run, checkpoint.total, detail::RunValue(checkpoint.run));
+        }
+    }
+
+    void EnterUnreadRun() {
+        if (m_cursor.consumed >= m_cursor.runLength) {
+            Jump();
+            if (m_cursor.runLength == 0) {  // a separator: the value goes on in the run after it
+                Jump();
+            }
+        }
+    }
+
+    const unsigned char* m_runs;
+    std::size_t m_size;
+    detail::LazyRunCheckpoints& m_checkpoints;
+    Cursor m_cursor;
+};
+
 }  // namespace
 
 BitwiseRLECompressedData::BitwiseRLECompressedData(unsigned char* buffer, RasterInfo& info)
     : m_size(0),
       m_info(info),
       m_checkpoints(std::make_shared<detail::LazyRunCheckpoints>()),
-      m_runIndex(0),
-      m_position(0),
-      m_runLength(0),
-      m_consumed(0),
-      m_bitValue(false) {
+      m_cursor{} {
     if (buffer == nullptr) {
         throw kora::DataException("pBuffer is NULL, cannot compress NULL buffer", kSourcePath,
                                   "__cdecl kora::kubo::BitwiseRLECompressedData::"
@@ -87,7 +233,7 @@ BitwiseRLECompressedData::BitwiseRLECompressedData(unsigned char* buffer, Raster
                                   25);
     }
     Compress(buffer, GetBufferSizeBytes() * 8);
-    ResetSeek();
+    m_cursor = Reader::Start(m_buffer.get());
 }
 
 BitwiseRLECompressedData::BitwiseRLECompressedData(const BitwiseRLECompressedData& other) = default;
@@ -180,124 +326,20 @@ void BitwiseRLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned
     const std::size_t rowBytes = w > 0 ? static_cast<std::size_t>(w) : 0;
     const std::size_t spacing =
         rowBytes * ((m_info.dataType.bits + 7u) / 8u) * std::size_t{m_info.channels};
-    std::size_t o = 0;
-    for (long long row = y; row < static_cast<long long>(y) + h && o < capacity;
-         ++row, o += spacing) {
-        Read(static_cast<std::uint64_t>(row) * GetLineSize() + static_cast<std::uint64_t>(x),
-             static_cast<std::uint64_t>(std::min(rowBytes, capacity - o)), out + o);
-    }
-}
-
-inline void BitwiseRLECompressedData::ResetSeek() const {
-    m_runIndex = 0;
-    m_position = 0;
-    m_runLength = m_buffer.get()[0];
-    m_consumed = 0;
-    m_bitValue = false;
-}
-
-inline void BitwiseRLECompressedData::Jump() const {
-    m_position += m_runLength - m_consumed;
-    ++m_runIndex;
-    if (m_runIndex >= m_size) {
-        throw kora::DataException(
-            kIndexNotFound, kSourcePath,
-            "void __cdecl kora::kubo::BitwiseRLECompressedData::Jump(void) const", 343);
-    }
-    m_runLength = m_buffer.get()[m_runIndex];
-    m_consumed = 0;
-    m_bitValue = !m_bitValue;
-}
-
-inline void BitwiseRLECompressedData::Seek(std::uint64_t bit) const {
-    if (bit < m_position) {
-        ResetSeek();
-    }
-    SkipToCheckpoint(bit);
-    // Nine jumps at once while all of them stay below the bit and inside the stream: the
-    // position grows by the rest of this run and the next eight runs, and the value flips
-    // nine times.
-    const unsigned char* runs = m_buffer.get();
-    while (m_runIndex + 9 < m_size) {
-        const std::uint64_t next = m_position + (m_runLength - m_consumed) +
-                                   detail::SumOfEightBytes(runs + m_runIndex + 1);
-        if (next >= bit) {
-            break;
-        }
-        m_position = next;
-        m_runIndex += 9;
-        m_runLength = runs[m_runIndex];
-        m_consumed = 0;
-        m_bitValue = !m_bitValue;
-    }
-    while (m_position < bit && m_runIndex < m_size) {
-        Jump();
-    }
-    // Reached only when an earlier failed jump left the cursor past the last run.
-    if (m_runIndex >= m_size) {
-        throw kora::DataException(
-            kIndexNotFound, kSourcePath,
-            "void __cdecl kora::kubo::BitwiseRLECompressedData::Seek(unsigned long) const", 318);
-    }
-    if (m_position == bit) {
-        return;
-    }
-    // The last jump passed the bit: step back into the run that holds it.
-    --m_runIndex;
-    m_runLength = m_buffer.get()[m_runIndex];
-    m_consumed = static_cast<std::uint32_t>(m_runLength - (m_position - bit));
-    m_position = bit;
-    m_bitValue = !m_bitValue;
-}
-
-// The cursor stands where the jumps below would take it: at the start of the last indexed
-// run that starts before the bit, when that run lies ahead. Run k holds bits of value k mod 2.
-inline void BitwiseRLECompressedData::SkipToCheckpoint(std::uint64_t bit) const {
-    if (bit == 0) {
-        return;
-    }
-    const auto checkpoint = m_checkpoints->Get(m_buffer.get(), m_size, 1).LastWithin(bit - 1);
-    if (checkpoint.run > m_runIndex) {
-        m_runIndex = checkpoint.run;
-        m_position = checkpoint.total;
-        m_runLength = m_buffer.get()[m_runIndex];
-        m_consumed = 0;
-        m_bitValue = (m_runIndex & 1u) != 0;
-    }
-}
-
-inline void BitwiseRLECompressedData::EnterUnreadRun() const {
-    if (m_consumed >= m_runLength) {
-        Jump();
-        if (m_runLength == 0) {  // a separator: the value goes on in the run after it
-            Jump();
-        }
-    }
-}
-
-inline void BitwiseRLECompressedData::Read(std::uint64_t byteOffset, std::uint64_t byteCount,
-                                           unsigned char* dst) const {
-    Seek(byteOffset * 8);
-    // The bits go out run by run. A run is entered only when a bit of it is read, so the
-    // cursor ends in the run that holds the last bit read, as read bit by bit.
-    BitWriter writer(dst);
+    Reader reader(m_buffer.get(), m_size, *m_checkpoints, m_cursor);
     try {
-        for (std::uint64_t left = byteCount * 8; left > 0;) {
-            EnterUnreadRun();
-            const std::uint32_t unread = m_runLength - m_consumed;
-            // An empty run after a separator (never written by the encoder) still gives a bit.
-            const auto take =
-                static_cast<std::uint32_t>(unread == 0 ? 1 : std::min<std::uint64_t>(unread, left));
-            writer.Put(take, m_bitValue);
-            m_consumed += take;
-            m_position += take;
-            left -= take;
+        std::size_t o = 0;
+        for (long long row = y; row < static_cast<long long>(y) + h && o < capacity;
+             ++row, o += spacing) {
+            reader.Read(
+                static_cast<std::uint64_t>(row) * GetLineSize() + static_cast<std::uint64_t>(x),
+                static_cast<std::uint64_t>(std::min(rowBytes, capacity - o)), out + o);
         }
     } catch (...) {
-        writer.Finish();  // the whole bytes read before the failure are delivered
+        m_cursor = reader.Where();
         throw;
     }
-    writer.Finish();
+    m_cursor = reader.Where();
 }
 
 }  // namespace kora::kubo

@@ -273,8 +273,8 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
         // stream nothing is added.
         if (total <= start && pair < pairs.Size()) {
             const std::uint64_t room = start - total;
-            const auto checkpoint =
-                checkpoints.LastWithin(passed > UINT64_MAX - room ? UINT64_MAX : passed + room);
+            const auto checkpoint = checkpoints.LastWithin(
+                passed > UINT64_MAX - room ? UINT64_MAX : passed + room, pair);
             if (checkpoint.run > pair) {
                 total += checkpoint.total - passed;
                 passed = checkpoint.total;

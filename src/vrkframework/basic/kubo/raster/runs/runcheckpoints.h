@@ -3,7 +3,7 @@
 #ifndef VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_RUNCHECKPOINTS_H
 #define VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_RUNCHECKPOINTS_H
 
-#include <algorithm>  // std::upper_bound
+#include <algorithm>  // std::min, std::upper_bound
 #include <atomic>
 #include <cstddef>  // std::size_t
 #include <cstdint>  // std::uint32_t, std::uint64_t
@@ -67,9 +67,18 @@ public:
         AppendCheckpointTotals(runs, runCount, stride, m_spacing, m_totals);
     }
 
-    /// The last checkpoint whose total is at most `limit` (the first run, total 0, at least).
-    Checkpoint LastWithin(std::uint64_t limit) const {
-        return LastCheckpointWithin(m_totals.data(), m_totals.size(), m_spacing, limit);
+    /// The last checkpoint after run `pastRun` whose total is at most `limit`, or the first
+    /// run (total 0) when none is. A walk standing at `pastRun` asks in constant time whether
+    /// a checkpoint lies between it and its target.
+    Checkpoint LastWithin(std::uint64_t limit, std::size_t pastRun = 0) const {
+        // Checkpoint b stands at run (b + 1) x spacing.
+        const std::size_t first = std::min(pastRun / m_spacing, m_totals.size());
+        if (first == m_totals.size() || m_totals[first] > limit) {
+            return Checkpoint{0, 0};
+        }
+        const Checkpoint found = LastCheckpointWithin(m_totals.data() + first,
+                                                      m_totals.size() - first, m_spacing, limit);
+        return Checkpoint{found.run + first * m_spacing, found.total};
     }
 
 private:
