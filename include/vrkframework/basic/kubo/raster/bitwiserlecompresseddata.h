@@ -14,7 +14,7 @@
 
 namespace kora::kubo {
 namespace detail {
-class LazyRunCheckpoints;
+class RunCheckpoints;
 
 /// Where a bit-run stream's read cursor stands.
 struct BitRunCursor {
@@ -36,7 +36,7 @@ struct BitRunCursor {
 /// RasterInfo part stays zero, except that copies take it from their source.
 ///
 /// Copies share the runs (they never change after construction) and an index into them
-/// (8 bytes per KiB of runs, made by the first window decode) from which the cursor skips
+/// (8 bytes per KiB of runs, made with them) from which the cursor skips
 /// ahead to near the bit it seeks; the last holder releases them. Each object has its own read
 /// cursor, which the window decoder moves although it is const: one object must not be decoded by
 /// window from two threads at once. Moving copies, so the source stays usable.
@@ -100,7 +100,7 @@ private:
     std::shared_ptr<unsigned char> m_buffer;
     std::size_t m_size;
     RasterInfo m_info;
-    std::shared_ptr<detail::LazyRunCheckpoints> m_checkpoints;  ///< made by the first window decode
+    std::shared_ptr<const detail::RunCheckpoints> m_checkpoints;  ///< made with the stream
     mutable detail::BitRunCursor m_cursor;
 };
 

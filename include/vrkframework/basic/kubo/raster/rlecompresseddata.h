@@ -13,7 +13,7 @@
 
 namespace kora::kubo {
 namespace detail {
-class LazyRunCheckpoints;
+class RunCheckpoints;
 }
 
 /// The raw bytes of a raster, margins included, as one stream of (count, value) byte
@@ -26,7 +26,7 @@ class LazyRunCheckpoints;
 /// stays zero, except that copies take it from their source.
 ///
 /// Copies share the compressed bytes (they never change after construction) and an index
-/// into them (8 bytes per KiB of pairs, made by the first window decode) from which a
+/// into them (8 bytes per KiB of pairs, made with them) from which a
 /// window starts its walk near its first row; the last holder releases them. Moving copies as well,
 /// so the source stays usable.
 class KUBO_API RLECompressedData : public ICompressedData {
@@ -87,7 +87,7 @@ private:
     std::shared_ptr<unsigned char> m_buffer;
     RasterInfo m_info;
     std::size_t m_size;
-    std::shared_ptr<detail::LazyRunCheckpoints> m_checkpoints;  ///< made by the first window decode
+    std::shared_ptr<const detail::RunCheckpoints> m_checkpoints;  ///< made with the stream
 };
 
 }  // namespace kora::kubo

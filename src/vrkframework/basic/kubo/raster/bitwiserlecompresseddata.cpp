@@ -81,7 +81,7 @@ using Cursor = detail::BitRunCursor;
 // also when a read fails.
 class Reader {
 public:
-    Reader(const unsigned char* runs, std::size_t size, detail::LazyRunCheckpoints& checkpoints,
+    Reader(const unsigned char* runs, std::size_t size, const detail::RunCheckpoints& checkpoints,
            const Cursor& cursor)
         : m_runs(runs), m_size(size), m_checkpoints(checkpoints), m_cursor(cursor) {}
 
@@ -196,8 +196,7 @@ private:
         if (bit == 0) {
             return;
         }
-        const auto checkpoint =
-            m_checkpoints.Get(m_runs, m_size, 1).LastWithin(bit - 1, m_cursor.runIndex);
+        const auto checkpoint = m_checkpoints.LastWithin(bit - 1, m_cursor.runIndex);
         if (checkpoint.run > m_cursor.runIndex) {
             EnterRun(checkpoint.run, checkpoint.total, detail::RunValue(checkpoint.run));
         }
@@ -214,17 +213,14 @@ private:
 
     const unsigned char* m_runs;
     std::size_t m_size;
-    detail::LazyRunCheckpoints& m_checkpoints;
+    const detail::RunCheckpoints& m_checkpoints;
     Cursor m_cursor;
 };
 
 }  // namespace
 
 BitwiseRLECompressedData::BitwiseRLECompressedData(unsigned char* buffer, RasterInfo& info)
-    : m_size(0),
-      m_info(info),
-      m_checkpoints(std::make_shared<detail::LazyRunCheckpoints>()),
-      m_cursor{} {
+    : m_size(0), m_info(info), m_cursor{} {
     if (buffer == nullptr) {
         throw kora::DataException("pBuffer is NULL, cannot compress NULL buffer", kSourcePath,
                                   "__cdecl kora::kubo::BitwiseRLECompressedData::"
@@ -266,6 +262,7 @@ void BitwiseRLECompressedData::Compress(unsigned char* buffer, std::uint64_t bit
         sink);
     m_size = sink.Size();
     m_buffer = sink.Release();
+    m_checkpoints = std::make_shared<const detail::RunCheckpoints>(m_buffer.get(), m_size, 1);
 }
 
 std::uint64_t BitwiseRLECompressedData::GetLineSize() const {

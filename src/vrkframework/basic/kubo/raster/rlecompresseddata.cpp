@@ -145,8 +145,7 @@ RLECompressedData::RLECompressedData(unsigned char* buffer, RasterInfo& info,
                                      RasterContext& context)
     : m_info(info.width + 2 * context.xMargin, info.height + 2 * context.yMargin, info.channels,
              info.dataType),
-      m_size(0),
-      m_checkpoints(std::make_shared<detail::LazyRunCheckpoints>()) {
+      m_size(0) {
     if (buffer == nullptr) {
         throw kora::DataException("pBuffer is NULL, cannot compress NULL buffer", kSourcePath,
                                   "__cdecl kora::kubo::RLECompressedData::RLECompressedData("
@@ -155,6 +154,7 @@ RLECompressedData::RLECompressedData(unsigned char* buffer, RasterInfo& info,
                                   30);
     }
     m_buffer = EncodePairs(buffer, GetRasterSize(), m_size);
+    m_checkpoints = std::make_shared<const detail::RunCheckpoints>(m_buffer.get(), m_size / 2, 2);
 }
 
 RLECompressedData::RLECompressedData(const RLECompressedData& other) = default;
@@ -260,7 +260,7 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
         pixel;
     const auto rowBytes = static_cast<std::size_t>(w);
     const PairStream pairs(m_buffer.get(), m_size);
-    const detail::RunCheckpoints& checkpoints = m_checkpoints->Get(m_buffer.get(), m_size / 2, 2);
+    const detail::RunCheckpoints& checkpoints = *m_checkpoints;
     std::size_t pair = 0;
     std::uint64_t total = 0;
     // The counts of the pairs before `pair` while it lies in the stream. The running total
@@ -269,8 +269,8 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
     for (std::size_t o = 0; h > 0 && o < capacity; --h, o += rowBytes, start += stride) {
         // Seek: add counts until the total passes the row's start. Whole stretches of
         // pairs go at once while the total stays at or below it: first up to the last
-        // checkpoint that keeps it so, then sixteen, then four pairs at a time. Past the
-        // stream nothing is added.
+        // checkpoint that keeps it so, then sixty-four, sixteen and four pairs at a time.
+        // Past the stream nothing is added.
         if (total <= start && pair < pairs.Size()) {
             const std::uint64_t room = start - total;
             const auto checkpoint = checkpoints.LastWithin(
@@ -283,7 +283,10 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
         }
         while (total <= start && pair < pairs.Size()) {
             std::uint64_t count;
-            if (pairs.Size() - pair >= 16 && total + pairs.SumOf<4>(pair) <= start) {
+            if (pairs.Size() - pair >= 64 && total + pairs.SumOf<16>(pair) <= start) {
+                count = pairs.SumOf<16>(pair);
+                pair += 64;
+            } else if (pairs.Size() - pair >= 16 && total + pairs.SumOf<4>(pair) <= start) {
                 count = pairs.SumOf<4>(pair);
                 pair += 16;
             } else if (pairs.Size() - pair >= 4 && total + pairs.SumOf<1>(pair) <= start) {

@@ -4,10 +4,8 @@
 #define VRKFRAMEWORK_BASIC_KUBO_RASTER_RUNS_RUNCHECKPOINTS_H
 
 #include <algorithm>  // std::min, std::upper_bound
-#include <atomic>
-#include <cstddef>  // std::size_t
-#include <cstdint>  // std::uint32_t, std::uint64_t
-#include <memory>   // std::unique_ptr, std::make_unique
+#include <cstddef>    // std::size_t
+#include <cstdint>    // std::uint32_t, std::uint64_t
 #include <vector>
 
 namespace kora::kubo::detail {
@@ -84,34 +82,6 @@ public:
 private:
     std::size_t m_spacing;
     std::vector<std::uint64_t> m_totals;
-};
-
-/// The checkpoints of a stream, made by the first window decode that needs them, so that
-/// making and whole decoding never pay for them. Threads that ask at once may each make
-/// them; one set is kept. Copies of a stream share one.
-class LazyRunCheckpoints {
-public:
-    LazyRunCheckpoints() = default;
-    LazyRunCheckpoints(const LazyRunCheckpoints&) = delete;
-    LazyRunCheckpoints& operator=(const LazyRunCheckpoints&) = delete;
-    ~LazyRunCheckpoints() { delete m_checkpoints.load(); }
-
-    /// The checkpoints of `runCount` runs of `stride` bytes at `runs`; every call passes the
-    /// same stream.
-    const RunCheckpoints& Get(const unsigned char* runs, std::size_t runCount, std::size_t stride) {
-        const RunCheckpoints* kept = m_checkpoints.load(std::memory_order_acquire);
-        if (kept == nullptr) {
-            auto made = std::make_unique<const RunCheckpoints>(runs, runCount, stride);
-            if (m_checkpoints.compare_exchange_strong(kept, made.get(),
-                                                      std::memory_order_acq_rel)) {
-                kept = made.release();
-            }
-        }
-        return *kept;
-    }
-
-private:
-    std::atomic<const RunCheckpoints*> m_checkpoints{nullptr};
 };
 
 }  // namespace kora::kubo::detail
