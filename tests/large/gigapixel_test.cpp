@@ -57,8 +57,7 @@ Bytes SliceOf(const unsigned char* bytes, std::uint64_t rowBytes, std::uint64_t 
 }
 
 // Times the 256 x 256 window at the bottom right of `data` (`side` columns and rows), then
-// the one to its left: the first pays for a bit-run stream's checkpoints, which are made on
-// the first window decode, and for the cold cache.
+// the one to its left: the first pays for the cold cache.
 template <class Compressed>
 void ReportBottomWindows(const char* form, const Compressed& data, unsigned int side,
                          Bytes& bottom) {

@@ -34,13 +34,14 @@ constexpr bool kVector64BitMultiply =
     false;
 #endif
 
-/// Comparisons that write a mask register (one bit a lane) rather than a vector of lanes.
-constexpr bool kCompareIntoMaskRegisters =
+/// Comparisons that write a mask register (one bit a lane) rather than a vector of lanes,
+/// for byte lanes too. Also a macro, for the code that spells such instructions out.
 #if defined(__AVX512F__) && defined(__AVX512BW__) && defined(__AVX512VL__)
-    true;
+#define KUBO_DETAIL_MASK_REGISTERS 1
 #else
-    false;
+#define KUBO_DETAIL_MASK_REGISTERS 0
 #endif
+constexpr bool kCompareIntoMaskRegisters = KUBO_DETAIL_MASK_REGISTERS;
 
 /// Rounding of floating lanes toward zero, to whole values.
 constexpr bool kVectorRounding =

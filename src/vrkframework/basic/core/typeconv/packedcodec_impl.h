@@ -12,6 +12,7 @@
 
 #include "vrkframework/basic/core/byteorder.h"
 #include "vrkframework/basic/core/kernels/capabilities.h"
+#include "vrkframework/basic/core/kernels/onebitblocks.h"
 
 namespace typeconv::detail {
 namespace {
@@ -58,7 +59,15 @@ template <unsigned int Bits, class T>
 std::size_t UnpackWithinBytes(const unsigned char* __restrict packed, T* __restrict samples,
                               std::size_t count) {
     constexpr unsigned int kPerByte = 8 / Bits;
-    for (std::size_t i = 0; i < count / kPerByte; ++i) {
+    std::size_t i = 0;
+#if KUBO_DETAIL_MASK_REGISTERS
+    if constexpr (Bits == 1 && sizeof(T) == 1) {
+        for (; i + 8 <= count / 8; i += 8) {
+            kora::kubo::detail::UnpackOneBitBlock(packed + i, samples + 8 * i);
+        }
+    }
+#endif
+    for (; i < count / kPerByte; ++i) {
         const unsigned int byte = packed[i];
         if constexpr (Bits == 1 && sizeof(T) == 1 && kVector64BitMultiply) {
             // Where 64-bit lanes multiply this is the fastest (the shifts are elsewhere):
@@ -144,7 +153,15 @@ template <unsigned int Bits, class T>
 std::size_t PackWithinBytes(const T* __restrict samples, unsigned char* __restrict packed,
                             std::size_t count) {
     constexpr unsigned int kPerByte = 8 / Bits;
-    for (std::size_t i = 0; i < count / kPerByte; ++i) {
+    std::size_t i = 0;
+#if KUBO_DETAIL_MASK_REGISTERS
+    if constexpr (Bits == 1 && sizeof(T) == 1) {
+        for (; i + 8 <= count / 8; i += 8) {
+            kora::kubo::detail::PackOneBitBlock(samples + 8 * i, packed + i, 1);
+        }
+    }
+#endif
+    for (; i < count / kPerByte; ++i) {
         if constexpr (Bits == 1 && sizeof(T) == 1) {
             const std::uint64_t lows =
                 LoadLowFirst(reinterpret_cast<const unsigned char*>(samples + 8 * i)) &

@@ -11,6 +11,7 @@
 #include <utility>      // std::index_sequence
 
 #include "vrkframework/basic/core/kernels/capabilities.h"
+#include "vrkframework/basic/core/kernels/onebitblocks.h"
 #include "vrkframework/basic/core/typeconv/componenttraits.h"
 #include "vrkframework/basic/kubo/masks/bkgdrule.h"
 #include "vrkframework/basic/kubo/masks/maskloops.h"
@@ -78,7 +79,13 @@ unsigned char PackEight(const unsigned char* flags, std::size_t n) {
 void PackFlagsLoop(const unsigned char* __restrict flags, unsigned char* __restrict bits,
                    std::size_t count) {
     const std::size_t whole = count / 8;
-    for (std::size_t i = 0; i < whole; ++i) {
+    std::size_t i = 0;
+#if KUBO_DETAIL_MASK_REGISTERS
+    for (; i + 8 <= whole; i += 8) {
+        PackOneBitBlock(flags + 8 * i, bits + i, static_cast<char>(0xFF));
+    }
+#endif
+    for (; i < whole; ++i) {
         bits[i] = PackEight(flags + 8 * i, 8);
     }
     if (count % 8 != 0) {
