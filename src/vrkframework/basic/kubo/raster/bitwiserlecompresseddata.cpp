@@ -109,7 +109,9 @@ public:
                 m_cursor.consumed += take;
                 m_cursor.position += take;
                 left -= take;
-                // The value goes on when the run ends at a separator that is not the last run.
+                // The stretch goes on when the run ends at a separator with a run after it:
+                // the two jumps over them keep the value and cannot fail, so nothing is left
+                // unwritten when a jump throws.
                 const bool goesOn = left > 0 && m_cursor.consumed == m_cursor.runLength &&
                                     m_cursor.runIndex + 2 < m_size &&
                                     m_runs[m_cursor.runIndex + 1] == 0;
