@@ -1,8 +1,8 @@
-// Blocks of 64 one-bit samples (or flags) between a packed stream and one byte per sample, through
-// mask registers: a byte compare or a masked move handles all 64 at once, where packing
-// them with scalar words takes a multiply and a store per eight (private to the library;
-// compiled only where KUBO_DETAIL_MASK_REGISTERS is set, with internal linkage, so that
-// the copies of different kernel variants never mix).
+// Blocks of 64 one-bit samples (or flags) between a packed stream and one byte per sample,
+// through mask registers: a byte compare or a masked move handles all 64 at once, where
+// packing them with scalar words takes a multiply and a store per eight (private to the
+// library; compiled only where KUBO_DETAIL_MASK_REGISTERS is set, with internal linkage, so
+// that the copies of different kernel variants never mix).
 #ifndef VRKFRAMEWORK_BASIC_CORE_KERNELS_ONEBITBLOCKS_H
 #define VRKFRAMEWORK_BASIC_CORE_KERNELS_ONEBITBLOCKS_H
 

@@ -325,14 +325,14 @@ void BitwiseRLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned
     const std::size_t rowBytes = w > 0 ? static_cast<std::size_t>(w) : 0;
     const std::size_t spacing =
         rowBytes * ((m_info.dataType.bits + 7u) / 8u) * std::size_t{m_info.channels};
+    const std::uint64_t lineSize = GetLineSize();
     Reader reader(m_buffer.get(), m_size, *m_checkpoints, m_cursor);
     try {
         std::size_t o = 0;
         for (long long row = y; row < static_cast<long long>(y) + h && o < capacity;
              ++row, o += spacing) {
-            reader.Read(
-                static_cast<std::uint64_t>(row) * GetLineSize() + static_cast<std::uint64_t>(x),
-                static_cast<std::uint64_t>(std::min(rowBytes, capacity - o)), out + o);
+            reader.Read(static_cast<std::uint64_t>(row) * lineSize + static_cast<std::uint64_t>(x),
+                        static_cast<std::uint64_t>(std::min(rowBytes, capacity - o)), out + o);
         }
     } catch (...) {
         m_cursor = reader.Where();
