@@ -75,6 +75,15 @@ bool DecodeSingles(const unsigned char* pairs, unsigned char* out) {
     return true;
 }
 
+// Writes the values of the 4 pairs at `pairs` and returns how many of them come first
+// with count 1: those bytes are decoded, the ones after them are left to be overwritten.
+unsigned int DecodeLeadingSingles(const unsigned char* pairs, unsigned char* out) {
+    const std::uint64_t four = detail::LoadLowFirst(pairs);
+    const std::uint64_t others = (four & kCountBytes) ^ kLaneOnes;
+    detail::StoreLowFirst(out, ValuesOfFour(four));
+    return others == 0 ? 4 : detail::LowestSetBit(others) / 16;
+}
+
 detail::EncodedBytes EncodePairs(const unsigned char* in, std::size_t count, std::size_t& size) {
     detail::ByteSink sink(2 * count);
     unsigned char* out = sink.Reserve(2 * count);
@@ -130,8 +139,27 @@ public:
         return static_cast<std::uint32_t>((counts * kLaneOnes) >> 48);
     }
 
-    // Whether the block of pairs after `pair` lies in the stream.
-    bool HasBlockAfter(std::size_t pair) const { return pair < m_count && m_count - pair > kBlock; }
+    // How many of the 4 pairs from `pair` (all within the stream) can be added one after
+    // the other without their sum passing `room`, and that sum in `sum`. The running sums
+    // of the four counts lie in the 16-bit lanes of one word and are compared with the
+    // room all at once; they grow with each pair, so the ones that fit come first.
+    unsigned int FitOfFour(std::size_t pair, std::uint64_t room, std::uint64_t& sum) const {
+        constexpr std::uint64_t kLaneSigns = kLaneOnes << 15;
+        const std::uint64_t running =
+            (detail::LoadLowFirst(m_pairs + 2 * pair) & kCountBytes) * kLaneOnes;
+        // Sums stay below 2^15, so a lane holding 2^15 + room keeps its sign bit exactly
+        // where the room reaches the sum, and no lane borrows from the next.
+        const std::uint64_t lanes = std::min<std::uint64_t>(room, 0x7FFF) * kLaneOnes;
+        const std::uint64_t misses = ~((lanes | kLaneSigns) - running) & kLaneSigns;
+        const unsigned int fit = misses == 0 ? 4 : detail::LowestSetBit(misses) / 16;
+        sum = fit == 4 ? running >> 48 : ((running << 16) >> (16 * fit)) & 0xFFFF;
+        return fit;
+    }
+
+    // Whether the `count` pairs after `pair` lie in the stream.
+    bool HasAfter(std::size_t pair, std::size_t count) const {
+        return pair < m_count && m_count - pair > count;
+    }
     const unsigned char* At(std::size_t pair) const { return m_pairs + 2 * pair; }
 
 private:
@@ -213,10 +241,7 @@ void RLECompressedData::Decode(unsigned char* out) const {
             // Inside such a block, the pairs of count 1 before the longer run go four at a
             // time; writing all four values is safe, as four more pairs are left.
             if (end - pair >= 8) {
-                const std::uint64_t four = detail::LoadLowFirst(pair);
-                const std::uint64_t others = (four & kCountBytes) ^ kLaneOnes;
-                detail::StoreLowFirst(out, ValuesOfFour(four));
-                const unsigned int singles = others == 0 ? 4 : detail::LowestSetBit(others) / 16;
+                const unsigned int singles = DecodeLeadingSingles(pair, out);
                 out += singles;
                 pair += std::size_t{2} * singles;
                 if (singles == 4) {
@@ -269,32 +294,37 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
     for (std::size_t o = 0; h > 0 && o < capacity; --h, o += rowBytes, start += stride) {
         // Seek: add counts until the total passes the row's start. Whole stretches of
         // pairs go at once while the total stays at or below it: first up to the last
-        // checkpoint that keeps it so, then sixty-four, sixteen and four pairs at a time.
-        // Past the stream nothing is added.
+        // checkpoint that keeps it so, then sixty-four and sixteen pairs at a time, then
+        // four at a time up to the pair that passes. A block that does not fit does not fit
+        // from any later pair either (no count is negative), so each size is given up for
+        // the next at its first failure. Past the stream nothing is added.
         if (total <= start && pair < pairs.Size()) {
-            const std::uint64_t room = start - total;
+            std::uint64_t room = start - total;
             const auto checkpoint = checkpoints.LastWithin(
                 passed > UINT64_MAX - room ? UINT64_MAX : passed + room, pair);
             if (checkpoint.run > pair) {
-                total += checkpoint.total - passed;
-                passed = checkpoint.total;
+                room -= checkpoint.total - passed;
                 pair = checkpoint.run;
             }
+            while (pairs.Size() - pair >= 64 && pairs.SumOf<16>(pair) <= room) {
+                room -= pairs.SumOf<16>(pair);
+                pair += 64;
+            }
+            while (pairs.Size() - pair >= 16 && pairs.SumOf<4>(pair) <= room) {
+                room -= pairs.SumOf<4>(pair);
+                pair += 16;
+            }
+            for (unsigned int fit = 4; fit == 4 && pairs.Size() - pair >= 4;) {
+                std::uint64_t sum;
+                fit = pairs.FitOfFour(pair, room, sum);
+                room -= sum;
+                pair += fit;
+            }
+            passed += (start - room) - total;
+            total = start - room;
         }
         while (total <= start && pair < pairs.Size()) {
-            std::uint64_t count;
-            if (pairs.Size() - pair >= 64 && total + pairs.SumOf<16>(pair) <= start) {
-                count = pairs.SumOf<16>(pair);
-                pair += 64;
-            } else if (pairs.Size() - pair >= 16 && total + pairs.SumOf<4>(pair) <= start) {
-                count = pairs.SumOf<4>(pair);
-                pair += 16;
-            } else if (pairs.Size() - pair >= 4 && total + pairs.SumOf<1>(pair) <= start) {
-                count = pairs.SumOf<1>(pair);
-                pair += 4;
-            } else {
-                count = pairs.Count(pair++);
-            }
+            const std::uint64_t count = pairs.Count(pair++);
             total += count;
             passed += count;
         }
@@ -308,14 +338,23 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
         unsigned char* row = out + o;
         for (std::size_t left = std::min(rowBytes, capacity - o); left > 0;) {
             if (remaining == 0) {
-                // Noise: a block of pairs of count 1 entered at once.
-                if (left >= kBlock && pairs.HasBlockAfter(pair) &&
-                    DecodeSingles(pairs.At(pair + 1), row)) {
-                    passed += pairs.Count(pair) + (kBlock - 1);
-                    total += kBlock;
-                    pair += kBlock;
-                    row += kBlock;
-                    left -= kBlock;
+                // Noise: pairs of count 1 are entered without a fill each, a block at once
+                // where the whole block is such pairs, else up to four.
+                std::size_t singles = 0;
+                if (pairs.Count(pair + 1) == 1) {
+                    if (left >= kBlock && pairs.HasAfter(pair, kBlock) &&
+                        DecodeSingles(pairs.At(pair + 1), row)) {
+                        singles = kBlock;
+                    } else if (left >= 4 && pairs.HasAfter(pair, 4)) {
+                        singles = DecodeLeadingSingles(pairs.At(pair + 1), row);
+                    }
+                }
+                if (singles != 0) {
+                    passed += pairs.Count(pair) + (singles - 1);
+                    total += singles;
+                    pair += singles;
+                    row += singles;
+                    left -= singles;
                     continue;
                 }
                 // The total grows by the count of the pair entered (not of the one left):

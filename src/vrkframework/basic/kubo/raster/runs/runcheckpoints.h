@@ -74,9 +74,18 @@ public:
         if (first == m_totals.size() || m_totals[first] > limit) {
             return Checkpoint{0, 0};
         }
-        const Checkpoint found = LastCheckpointWithin(m_totals.data() + first,
-                                                      m_totals.size() - first, m_spacing, limit);
-        return Checkpoint{found.run + first * m_spacing, found.total};
+        // The target usually lies a few checkpoints ahead: steps that double from the first
+        // one bracket it, and the search runs within that bracket only.
+        std::size_t within = first;
+        std::size_t step = 1;
+        while (m_totals.size() - within > step && m_totals[within + step] <= limit) {
+            within += step;
+            step *= 2;
+        }
+        const std::size_t end = std::min(within + step, m_totals.size());
+        const Checkpoint found =
+            LastCheckpointWithin(m_totals.data() + within, end - within, m_spacing, limit);
+        return Checkpoint{found.run + within * m_spacing, found.total};
     }
 
 private:
