@@ -13,7 +13,8 @@ namespace kora::kubo::detail {
 /// Streams index themselves every 1 KiB of runs: 8 bytes of checkpoint per KiB keeps an index
 /// under 1 % of what it indexes, and the walk from a checkpoint to any position covers at
 /// most 1 KiB.
-constexpr std::size_t kStreamBytesPerCheckpoint = 1024;
+constexpr unsigned int kCheckpointSpacingBits = 10;
+constexpr std::size_t kStreamBytesPerCheckpoint = std::size_t{1} << kCheckpointSpacingBits;
 
 /// A place in a stream of runs: the index of a run and the sum of the counts before it.
 struct Checkpoint {
@@ -56,11 +57,12 @@ inline Checkpoint LastCheckpointWithin(const std::uint64_t* totals, std::size_t 
     return after == 0 ? Checkpoint{0, 0} : Checkpoint{after * spacing, totals[after - 1]};
 }
 
-/// The checkpoints of a whole stream whose runs take `stride` bytes each.
+/// The checkpoints of a whole stream whose runs take `stride` (1 or 2) bytes each.
 class RunCheckpoints {
 public:
     RunCheckpoints(const unsigned char* runs, std::size_t runCount, std::size_t stride)
-        : m_spacing(kStreamBytesPerCheckpoint / stride) {
+        : m_spacing(kStreamBytesPerCheckpoint / stride),
+          m_spacingBits(kCheckpointSpacingBits - (stride == 1 ? 0 : 1)) {
         m_totals.reserve(runCount / m_spacing);
         AppendCheckpointTotals(runs, runCount, stride, m_spacing, m_totals);
     }
@@ -70,7 +72,7 @@ public:
     /// a checkpoint lies between it and its target.
     Checkpoint LastWithin(std::uint64_t limit, std::size_t pastRun = 0) const {
         // Checkpoint b stands at run (b + 1) x spacing.
-        const std::size_t first = std::min(pastRun / m_spacing, m_totals.size());
+        const std::size_t first = std::min(pastRun >> m_spacingBits, m_totals.size());
         if (first == m_totals.size() || m_totals[first] > limit) {
             return Checkpoint{0, 0};
         }
@@ -90,6 +92,7 @@ public:
 
 private:
     std::size_t m_spacing;
+    unsigned int m_spacingBits;  ///< log2 of the spacing: a shift, not a division, per seek
     std::vector<std::uint64_t> m_totals;
 };
 
