@@ -167,9 +167,7 @@ private:
             m_cursor = Start(m_runs);
         }
         SkipToCheckpoint(bit);
-        JumpBlocks<64>(bit, [](const unsigned char* runs) {
-            return std::uint64_t{detail::SumOfCounts<1>(runs, 64)};
-        });
+        JumpBlocks<64>(bit, detail::SumOfBytes<64>);
         JumpBlocks<8>(bit, detail::SumOfEightBytes);
         while (m_cursor.position < bit && m_cursor.runIndex < m_size) {
             Jump();

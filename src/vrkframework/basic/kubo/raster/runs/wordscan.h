@@ -55,6 +55,18 @@ inline std::uint64_t SumOfEightBytes(const unsigned char* bytes) {
     return (pairs * 0x0001000100010001ull) >> 48;
 }
 
+/// The sum of the kCount bytes at `bytes`, a count small enough for the sum to fit 16 bits:
+/// the loop vectorises in 16-bit lanes, twice as many per vector as 32-bit ones.
+template <std::size_t kCount>
+std::uint32_t SumOfBytes(const unsigned char* bytes) {
+    static_assert(kCount * 255 <= 0xFFFF, "the sum fits 16 bits");
+    std::uint16_t sum = 0;
+    for (std::size_t k = 0; k < kCount; ++k) {
+        sum = static_cast<std::uint16_t>(sum + bytes[k]);
+    }
+    return sum;
+}
+
 /// As LoadHighFirst for the `count` (< 8) bytes left at the end of a buffer; the missing
 /// low bytes read as zero.
 inline std::uint64_t LoadHighFirstTail(const unsigned char* bytes, std::size_t count) {
