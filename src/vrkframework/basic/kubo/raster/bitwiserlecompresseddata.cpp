@@ -112,9 +112,21 @@ public:
                 // The stretch goes on when the run ends at a separator with a run after it:
                 // the two jumps over them keep the value and cannot fail, so nothing is left
                 // unwritten when a jump throws.
-                const bool goesOn = left > 0 && m_cursor.consumed == m_cursor.runLength &&
-                                    m_cursor.runIndex + 2 < m_size &&
-                                    m_runs[m_cursor.runIndex + 1] == 0;
+                bool goesOn = left > 0 && m_cursor.consumed == m_cursor.runLength &&
+                              m_cursor.runIndex + 2 < m_size && m_runs[m_cursor.runIndex + 1] == 0;
+                // Whole runs after separators join the stretch here, as the steps above
+                // would take them: over the separator, then every bit of the run.
+                while (goesOn && m_runs[m_cursor.runIndex + 2] != 0 &&
+                       m_runs[m_cursor.runIndex + 2] <= left) {
+                    m_cursor.runIndex += 2;
+                    m_cursor.runLength = m_runs[m_cursor.runIndex];
+                    m_cursor.consumed = m_cursor.runLength;
+                    m_cursor.position += m_cursor.runLength;
+                    stretch += m_cursor.runLength;
+                    left -= m_cursor.runLength;
+                    goesOn = left > 0 && m_cursor.runIndex + 2 < m_size &&
+                             m_runs[m_cursor.runIndex + 1] == 0;
+                }
                 if (!goesOn) {
                     writer.Put(stretch, m_cursor.bitValue);
                     stretch = 0;
