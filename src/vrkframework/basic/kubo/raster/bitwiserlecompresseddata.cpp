@@ -109,14 +109,9 @@ public:
                 m_cursor.consumed += take;
                 m_cursor.position += take;
                 left -= take;
-                // The stretch goes on when the run ends at a separator with a run after it:
-                // the two jumps over them keep the value and cannot fail, so nothing is left
-                // unwritten when a jump throws.
-                bool goesOn = left > 0 && m_cursor.consumed == m_cursor.runLength &&
-                              m_cursor.runIndex + 2 < m_size && m_runs[m_cursor.runIndex + 1] == 0;
                 // Whole runs after separators join the stretch here, as the steps above
                 // would take them: over the separator, then every bit of the run.
-                while (goesOn && m_runs[m_cursor.runIndex + 2] != 0 &&
+                while (StretchGoesOn(left) && m_runs[m_cursor.runIndex + 2] != 0 &&
                        m_runs[m_cursor.runIndex + 2] <= left) {
                     m_cursor.runIndex += 2;
                     m_cursor.runLength = m_runs[m_cursor.runIndex];
@@ -124,10 +119,8 @@ public:
                     m_cursor.position += m_cursor.runLength;
                     stretch += m_cursor.runLength;
                     left -= m_cursor.runLength;
-                    goesOn = left > 0 && m_cursor.runIndex + 2 < m_size &&
-                             m_runs[m_cursor.runIndex + 1] == 0;
                 }
-                if (!goesOn) {
+                if (!StretchGoesOn(left)) {
                     writer.Put(stretch, m_cursor.bitValue);
                     stretch = 0;
                 }
@@ -140,6 +133,14 @@ public:
     }
 
 private:
+    // Whether the stretch being read goes on: bits are left to read and the run ends at a
+    // separator with a run after it, where the two jumps keep the value and cannot fail, so
+    // nothing is left unwritten when a jump throws.
+    bool StretchGoesOn(std::uint64_t left) const {
+        return left > 0 && m_cursor.consumed == m_cursor.runLength &&
+               m_cursor.runIndex + 2 < m_size && m_runs[m_cursor.runIndex + 1] == 0;
+    }
+
     void Jump() {
         m_cursor.position += m_cursor.runLength - m_cursor.consumed;
         ++m_cursor.runIndex;

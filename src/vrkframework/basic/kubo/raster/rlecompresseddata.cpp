@@ -139,6 +139,20 @@ public:
         return static_cast<std::uint32_t>((counts * kLaneOnes) >> 48);
     }
 
+    // Moves `pair` over blocks of 4 x `words` pairs while their counts fit in `room`, which
+    // shrinks by each block's sum, as long as whole blocks are left in the stream.
+    template <std::size_t words>
+    void SkipBlocks(std::size_t& pair, std::uint64_t& room) const {
+        while (m_count - pair >= 4 * words) {
+            const std::uint64_t sum = SumOf<words>(pair);
+            if (sum > room) {
+                return;
+            }
+            room -= sum;
+            pair += 4 * words;
+        }
+    }
+
     // How many of the 4 pairs from `pair` (all within the stream) can be added one after
     // the other without their sum passing `room`, and that sum in `sum`. The running sums
     // of the four counts lie in the 16-bit lanes of one word and are compared with the
@@ -306,14 +320,8 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
                 room -= checkpoint.total - passed;
                 pair = checkpoint.run;
             }
-            while (pairs.Size() - pair >= 64 && pairs.SumOf<16>(pair) <= room) {
-                room -= pairs.SumOf<16>(pair);
-                pair += 64;
-            }
-            while (pairs.Size() - pair >= 16 && pairs.SumOf<4>(pair) <= room) {
-                room -= pairs.SumOf<4>(pair);
-                pair += 16;
-            }
+            pairs.SkipBlocks<16>(pair, room);
+            pairs.SkipBlocks<4>(pair, room);
             for (unsigned int fit = 4; fit == 4 && pairs.Size() - pair >= 4;) {
                 std::uint64_t sum;
                 fit = pairs.FitOfFour(pair, room, sum);

@@ -61,10 +61,9 @@ inline Checkpoint LastCheckpointWithin(const std::uint64_t* totals, std::size_t 
 class RunCheckpoints {
 public:
     RunCheckpoints(const unsigned char* runs, std::size_t runCount, std::size_t stride)
-        : m_spacing(kStreamBytesPerCheckpoint / stride),
-          m_spacingBits(kCheckpointSpacingBits - (stride == 1 ? 0 : 1)) {
-        m_totals.reserve(runCount / m_spacing);
-        AppendCheckpointTotals(runs, runCount, stride, m_spacing, m_totals);
+        : m_spacingBits(kCheckpointSpacingBits - (stride == 1 ? 0 : 1)) {
+        m_totals.reserve(runCount / Spacing());
+        AppendCheckpointTotals(runs, runCount, stride, Spacing(), m_totals);
     }
 
     /// The last checkpoint after run `pastRun` whose total is at most `limit`, or the first
@@ -86,12 +85,14 @@ public:
         }
         const std::size_t end = std::min(within + step, m_totals.size());
         const Checkpoint found =
-            LastCheckpointWithin(m_totals.data() + within, end - within, m_spacing, limit);
-        return Checkpoint{found.run + within * m_spacing, found.total};
+            LastCheckpointWithin(m_totals.data() + within, end - within, Spacing(), limit);
+        return Checkpoint{found.run + (within << m_spacingBits), found.total};
     }
 
 private:
-    std::size_t m_spacing;
+    /// Runs from one checkpoint to the next.
+    std::size_t Spacing() const { return std::size_t{1} << m_spacingBits; }
+
     unsigned int m_spacingBits;  ///< log2 of the spacing: a shift, not a division, per seek
     std::vector<std::uint64_t> m_totals;
 };
