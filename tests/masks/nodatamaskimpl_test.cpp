@@ -61,14 +61,14 @@ struct Channel {
     double value;
 };
 
-// Every combination of matching and differing samples over 1003 pixels, so that vector
-// bodies and tails both run, against the flags the rule gives. Under the pair rule an odd
-// stride pairs the last sample with the next pixel's first, tested as channel 1; the last
-// pixel has no next one.
+// Every combination of matching and differing samples over `count` pixels (by default
+// enough that vector bodies and tails both run), against the flags the rule gives. Under the pair
+// rule an odd stride pairs the last sample with the next pixel's first, tested as channel 1; the
+// last pixel has no next one.
 template <class T>
-void ExpectFlags(IMaskDecisionImpl& kernel, BkgdRule rule, const std::vector<Channel>& channels) {
+void ExpectFlags(IMaskDecisionImpl& kernel, BkgdRule rule, const std::vector<Channel>& channels,
+                 std::size_t count = 1003) {
     const std::size_t stride = channels.size();
-    const std::size_t count = 1003;
     std::vector<T> samples(count * stride);
     std::vector<bool> hits(count * stride + 1, false);
     for (std::size_t i = 0; i < count; ++i) {
@@ -169,6 +169,24 @@ const bool kSweepsRegistered = [] {
             },
             __FILE__, __LINE__);
     });
+    return true;
+}();
+
+// Colour pixels go 32 at a time where a step stays inside the samples: every count up to
+// three steps, each in a buffer of its exact size.
+const bool kColourCountsRegistered = [] {
+    kubo_test::RegisterPerVariant(
+        "NoDataKernels", "ColourPixelsOfEveryCount",
+        [] {
+            const std::vector<Channel> channels = {{true, 10}, {true, 11}, {true, 12}};
+            for (BkgdRule rule : {BkgdAllChans, BkgdAnyChan}) {
+                const Kernel kernel(Make(RealDescriptor<unsigned char>(), rule, channels));
+                for (std::size_t count = 0; count <= 100; ++count) {
+                    ExpectFlags<unsigned char>(*kernel, rule, channels, count);
+                }
+            }
+        },
+        __FILE__, __LINE__);
     return true;
 }();
 

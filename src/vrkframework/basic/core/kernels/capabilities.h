@@ -43,6 +43,14 @@ constexpr bool kVector64BitMultiply =
 #endif
 constexpr bool kCompareIntoMaskRegisters = KUBO_DETAIL_MASK_REGISTERS;
 
+/// Byte shuffles within the 128-bit halves of 256-bit vectors, and packing of their lanes.
+/// Also a macro, for the code that spells such instructions out.
+#if defined(__AVX2__)
+#define KUBO_DETAIL_WIDE_BYTE_SHUFFLES 1
+#else
+#define KUBO_DETAIL_WIDE_BYTE_SHUFFLES 0
+#endif
+
 /// Rounding of floating lanes toward zero, to whole values.
 constexpr bool kVectorRounding =
 #if defined(__SSE4_1__) || defined(__ARM_NEON)

@@ -7,7 +7,7 @@
 
 #include <array>
 #include <cstddef>      // std::size_t
-#include <type_traits>  // std::is_integral_v
+#include <type_traits>  // std::is_integral_v, std::is_same_v
 #include <utility>      // std::index_sequence
 
 #include "vrkframework/basic/core/kernels/capabilities.h"
@@ -16,6 +16,7 @@
 #include "vrkframework/basic/kubo/masks/bkgdrule.h"
 #include "vrkframework/basic/kubo/masks/maskloops.h"
 #include "vrkframework/basic/kubo/masks/nodatastorage.h"
+#include "vrkframework/basic/kubo/masks/threebytepixels.h"
 
 namespace kora::kubo::detail {
 namespace {
@@ -64,8 +65,18 @@ void FlagFixedStride(const T* __restrict samples, unsigned char* __restrict flag
 
 template <BkgdRule Rule, std::size_t C, class T, class Test>
 void FlagLoopOf(const void* samples, unsigned char* flags, std::size_t count, const void* tests) {
-    FlagFixedStride<Rule>(static_cast<const T*>(samples), flags, count,
-                          *static_cast<const std::array<Test, C>*>(tests));
+    const auto* pixels = static_cast<const T*>(samples);
+    const auto& channelTests = *static_cast<const std::array<Test, C>*>(tests);
+    std::size_t done = 0;
+#if KUBO_DETAIL_WIDE_BYTE_SHUFFLES
+    // The loop below vectorises three-byte pixels (colour images) with a shuffle per channel
+    // and position; spreading each pixel into a lane of its own takes one.
+    if constexpr (C == 3 && std::is_same_v<Test, PlainTest<unsigned char>> &&
+                  Rule != BkgdChanPairs) {
+        done = FlagThreeBytePixels<Rule>(pixels, flags, count, channelTests);
+    }
+#endif
+    FlagFixedStride<Rule>(pixels + C * done, flags + done, count - done, channelTests);
 }
 
 unsigned char PackEight(const unsigned char* flags, std::size_t n) {
