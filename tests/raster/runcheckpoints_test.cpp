@@ -11,32 +11,47 @@ namespace {
 using kora::kubo::detail::Checkpoint;
 using kora::kubo::detail::RunCheckpoints;
 
+// Runs from one checkpoint to the next in a stream of one-byte runs; pairs take half as many.
+constexpr std::size_t kSpacing = std::size_t{1} << kora::kubo::detail::kStreamCheckpointSpacingBits;
+
 void ExpectCheckpoint(const Checkpoint& found, std::size_t run, std::uint64_t total) {
     EXPECT_EQ(found.run, run);
     EXPECT_EQ(found.total, total);
 }
 
 TEST(RunCheckpoints, TheLastWithinALimitAndPastARun) {
-    // 5000 runs of count 2: checkpoints at runs 1024, 2048, 3072 and 4096.
-    const std::vector<unsigned char> runs(5000, 2);
+    // Runs of count 2: checkpoints at runs k, 2k, 3k and 4k (k the spacing), totals 2k to 8k.
+    constexpr std::size_t k = kSpacing;
+    const std::vector<unsigned char> runs(4 * k + k / 2, 2);
     const RunCheckpoints checkpoints(runs.data(), runs.size(), 1);
-    ExpectCheckpoint(checkpoints.LastWithin(2047), 0, 0);
-    ExpectCheckpoint(checkpoints.LastWithin(2048), 1024, 2048);
-    ExpectCheckpoint(checkpoints.LastWithin(6143), 2048, 4096);
-    ExpectCheckpoint(checkpoints.LastWithin(UINT64_MAX), 4096, 8192);
+    ExpectCheckpoint(checkpoints.LastWithin(2 * k - 1), 0, 0);
+    ExpectCheckpoint(checkpoints.LastWithin(2 * k), k, 2 * k);
+    ExpectCheckpoint(checkpoints.LastWithin(6 * k - 1), 2 * k, 4 * k);
+    ExpectCheckpoint(checkpoints.LastWithin(UINT64_MAX), 4 * k, 8 * k);
     // Only checkpoints after the run a walk stands on count; none there gives the first run.
-    ExpectCheckpoint(checkpoints.LastWithin(6143, 1023), 2048, 4096);
-    ExpectCheckpoint(checkpoints.LastWithin(6143, 2047), 2048, 4096);
-    ExpectCheckpoint(checkpoints.LastWithin(6143, 2048), 0, 0);
-    ExpectCheckpoint(checkpoints.LastWithin(UINT64_MAX, 3072), 4096, 8192);
-    ExpectCheckpoint(checkpoints.LastWithin(UINT64_MAX, 4096), 0, 0);
-    ExpectCheckpoint(checkpoints.LastWithin(UINT64_MAX, 100000), 0, 0);
+    ExpectCheckpoint(checkpoints.LastWithin(6 * k - 1, k - 1), 2 * k, 4 * k);
+    ExpectCheckpoint(checkpoints.LastWithin(6 * k - 1, 2 * k - 1), 2 * k, 4 * k);
+    ExpectCheckpoint(checkpoints.LastWithin(6 * k - 1, 2 * k), 0, 0);
+    ExpectCheckpoint(checkpoints.LastWithin(UINT64_MAX, 3 * k), 4 * k, 8 * k);
+    ExpectCheckpoint(checkpoints.LastWithin(UINT64_MAX, 4 * k), 0, 0);
+    ExpectCheckpoint(checkpoints.LastWithin(UINT64_MAX, 100 * k), 0, 0);
+}
+
+TEST(RunCheckpoints, TotalsPast32BitsStayExact) {
+    // Runs of 255 until the totals pass 2^32 by a few checkpoints, across many groups.
+    const std::size_t count = ((std::uint64_t{1} << 32) / 255 / kSpacing + 3) * kSpacing + 1;
+    const std::vector<unsigned char> runs(count, 255);
+    const RunCheckpoints checkpoints(runs.data(), runs.size(), 1);
+    const std::size_t last = count - 1;
+    ExpectCheckpoint(checkpoints.LastWithin(UINT64_MAX), last, std::uint64_t{255} * last);
+    const std::uint64_t justBelow = std::uint64_t{255} * (last - kSpacing) - 1;
+    ExpectCheckpoint(checkpoints.LastWithin(justBelow, last - 3 * kSpacing), last - 2 * kSpacing,
+                     std::uint64_t{255} * (last - 2 * kSpacing));
 }
 
 TEST(RunCheckpoints, AnyDistanceAheadAgreesWithAWalkOverAllOfThem) {
-    // 40 checkpoints; every third block of runs is empty, so totals repeat and the last of
-    // equal ones must be found.
-    constexpr std::size_t kSpacing = 1024;
+    // 40 checkpoints in three groups; every third block of runs is empty, so totals repeat
+    // and the last of equal ones must be found.
     std::vector<unsigned char> runs(41 * kSpacing);
     for (std::size_t run = 0; run < runs.size(); ++run) {
         runs[run] = run / kSpacing % 3 == 1 ? 0 : 1;
@@ -67,15 +82,16 @@ TEST(RunCheckpoints, AnyDistanceAheadAgreesWithAWalkOverAllOfThem) {
 }
 
 TEST(RunCheckpoints, PairsCountTheirFirstByteOnly) {
-    // 1025 pairs of count 3 and value 200: checkpoints at pairs 512 and 1024.
+    // Pairs of count 3 and value 200, checkpoints every k / 2 pairs: at k / 2 and k.
+    constexpr std::size_t k = kSpacing;
     std::vector<unsigned char> pairs;
-    for (int pair = 0; pair < 1025; ++pair) {
+    for (std::size_t pair = 0; pair < k + 1; ++pair) {
         pairs.insert(pairs.end(), {3, 200});
     }
     const RunCheckpoints checkpoints(pairs.data(), pairs.size() / 2, 2);
-    ExpectCheckpoint(checkpoints.LastWithin(UINT64_MAX), 1024, 3072);
-    ExpectCheckpoint(checkpoints.LastWithin(3071), 512, 1536);
-    ExpectCheckpoint(checkpoints.LastWithin(1535), 0, 0);
+    ExpectCheckpoint(checkpoints.LastWithin(UINT64_MAX), k, 3 * k);
+    ExpectCheckpoint(checkpoints.LastWithin(3 * k - 1), k / 2, 3 * k / 2);
+    ExpectCheckpoint(checkpoints.LastWithin(3 * k / 2 - 1), 0, 0);
 }
 
 }  // namespace

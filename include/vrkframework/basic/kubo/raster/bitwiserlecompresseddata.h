@@ -36,7 +36,7 @@ struct BitRunCursor {
 /// RasterInfo part stays zero, except that copies take it from their source.
 ///
 /// Copies share the runs (they never change after construction) and an index into them
-/// (8 bytes per KiB of runs, made with them) from which the cursor skips
+/// (9 bytes per KiB of runs, made with them) from which the cursor skips
 /// ahead to near the bit it seeks; the last holder releases them. Each object has its own read
 /// cursor, which the window decoder moves although it is const: one object must not be decoded by
 /// window from two threads at once. Moving copies, so the source stays usable.

@@ -26,7 +26,7 @@ class RunCheckpoints;
 /// stays zero, except that copies take it from their source.
 ///
 /// Copies share the compressed bytes (they never change after construction) and an index
-/// into them (8 bytes per KiB of pairs, made with them) from which a
+/// into them (9 bytes per KiB of pairs, made with them) from which a
 /// window starts its walk near its first row; the last holder releases them. Moving copies as well,
 /// so the source stays usable.
 class KUBO_API RLECompressedData : public ICompressedData {
