@@ -97,34 +97,25 @@ public:
             return Checkpoint{0, 0};
         }
         // The target usually lies a few checkpoints ahead: steps that double from the walk's
-        // own checkpoint bracket it, and halving steps search that bracket only. (Searching
-        // the bases first, then one group's offsets, measured slower: two searches end in two
-        // mispredicted exits where most seeks move a few checkpoints.)
-        const std::size_t checkpoint =
-            LastHolding(first, count, [&](std::size_t b) { return Total(b) <= limit; });
+        // own checkpoint bracket it, and halving steps search that bracket only, always
+        // standing on a checkpoint within the limit.
+        std::size_t checkpoint = first;
+        std::size_t step = 1;
+        while (count - checkpoint > step && Total(checkpoint + step) <= limit) {
+            checkpoint += step;
+            step *= 2;
+        }
+        for (std::size_t left = std::min(step, count - checkpoint); left > 1;) {
+            const std::size_t half = left / 2;
+            checkpoint = Total(checkpoint + half) <= limit ? checkpoint + half : checkpoint;
+            left -= half;
+        }
         return Checkpoint{(checkpoint + 1) << m_spacingBits, Total(checkpoint)};
     }
 
 private:
     /// Runs from one checkpoint to the next.
     std::size_t Spacing() const { return std::size_t{1} << m_spacingBits; }
-
-    /// The last index in [from, end) that `within` holds for, given that it holds for `from`
-    /// and, once it fails, fails for every later index.
-    template <class Within>
-    static std::size_t LastHolding(std::size_t from, std::size_t end, Within within) {
-        std::size_t step = 1;
-        while (end - from > step && within(from + step)) {
-            from += step;
-            step *= 2;
-        }
-        for (std::size_t left = std::min(step, end - from); left > 1;) {
-            const std::size_t half = left / 2;
-            from = within(from + half) ? from + half : from;
-            left -= half;
-        }
-        return from;
-    }
 
     std::uint64_t Total(std::size_t checkpoint) const {
         return m_bases[checkpoint >> kCheckpointGroupBits] + m_offsets[checkpoint];
