@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 #include <cstdint>
 #include <cstdio>
@@ -218,6 +219,12 @@ void CheckPair(const Pair& pair) {
         };
         CheckFamily(pair, layout, values, values.size() / pair.fromSize, run, family);
         CheckFamily(pair, layout, values, 2500, run, family);
+        // Blocks copied out past the caches, as outputs of kCopyOutBytes and more are.
+        const Run copiedOut = [&](const void* src, void* dst, std::size_t count) {
+            typeconv::detail::RunPromoteInBlocks(kernels, layout, pair.from, pair.to, src, dst,
+                                                 count, true);
+        };
+        CheckFamily(pair, layout, values, 2500, copiedOut, family + ", copied out");
         for (std::size_t count : kLengths) {
             CheckFamily(pair, layout, values, count, run, family);
         }
@@ -264,6 +271,57 @@ const bool kPairsRegistered = [] {
     }
     return true;
 }();
+
+// The copy out past the caches, per variant: every alignment of the destination and
+// lengths short of, across and well past a vector, nothing written around them.
+const bool kCopyOutRegistered = [] {
+    kubo_test::RegisterPerVariant(
+        "CopyOut", "EveryAlignmentAndLength",
+        [] {
+            const typeconv::detail::CopyOutKernel copyOut =
+                typeconv::detail::ActiveKernels().copyOut;
+            std::vector<unsigned char> block(700);
+            for (std::size_t i = 0; i < block.size(); ++i) {
+                block[i] = static_cast<unsigned char>(i * 37 + 11);
+            }
+            for (std::size_t offset = 0; offset < 64; ++offset) {
+                for (std::size_t bytes :
+                     {0u, 1u, 15u, 16u, 17u, 63u, 64u, 65u, 127u, 128u, 129u, 300u, 640u}) {
+                    std::vector<unsigned char> out(offset + bytes + kGuard, kSentinel);
+                    copyOut(block.data(), out.data() + offset, bytes);
+                    for (std::size_t i = 0; i < out.size(); ++i) {
+                        const bool copied = i >= offset && i < offset + bytes;
+                        ASSERT_EQ(out[i], copied ? block[i - offset] : kSentinel)
+                            << "offset " << offset << ", " << bytes << " bytes, byte " << i;
+                    }
+                }
+            }
+        },
+        __FILE__, __LINE__);
+    return true;
+}();
+
+// An output of kCopyOutBytes or more takes the copy out, at a destination off its cache
+// line: the same values as the blocks written in place.
+TEST(Promote, LargeOutputsAreTheSameCopiedOut) {
+    const std::size_t count = typeconv::detail::kCopyOutBytes / sizeof(double) + 37;
+    std::vector<short> input(count);
+    for (std::size_t i = 0; i < count; ++i) {
+        input[i] = static_cast<short>(i * 7919);
+    }
+    std::vector<double> expected(count);
+    typeconv::detail::RunPromoteInBlocks(typeconv::detail::ActiveKernels(), SampleLayout::kReal,
+                                         typeconv::detail::ComponentIndexOf<short>(),
+                                         typeconv::detail::ComponentIndexOf<double>(), input.data(),
+                                         expected.data(), count, false);
+    std::vector<double> output(count + 2, -1.0);
+    typeconv::Promote<short, double> family;
+    typeconv::IPromote& promote = family;
+    promote.Promote(input.data(), output.data() + 1, static_cast<unsigned int>(count));
+    EXPECT_EQ(output.front(), -1.0);
+    EXPECT_EQ(output.back(), -1.0);
+    EXPECT_TRUE(std::equal(expected.begin(), expected.end(), output.begin() + 1));
+}
 
 // ------------------------------------------------------------------ documented cases
 

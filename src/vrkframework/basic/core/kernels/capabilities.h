@@ -51,6 +51,18 @@ constexpr bool kCompareIntoMaskRegisters = KUBO_DETAIL_MASK_REGISTERS;
 #define KUBO_DETAIL_WIDE_BYTE_SHUFFLES 0
 #endif
 
+/// The width, in bytes, of the widest store that bypasses the caches (a non-temporal
+/// store), 0 where there is none. Also a macro, for the code that spells such stores out.
+#if defined(__AVX512F__)
+#define KUBO_DETAIL_STREAMING_STORE_BYTES 64
+#elif defined(__AVX__)
+#define KUBO_DETAIL_STREAMING_STORE_BYTES 32
+#elif defined(__SSE2__)
+#define KUBO_DETAIL_STREAMING_STORE_BYTES 16
+#else
+#define KUBO_DETAIL_STREAMING_STORE_BYTES 0
+#endif
+
 /// Rounding of floating lanes toward zero, to whole values.
 constexpr bool kVectorRounding =
 #if defined(__SSE4_1__) || defined(__ARM_NEON)

@@ -2,6 +2,9 @@
 // complex layouts.
 #include "vrkframework/basic/core/typeconv/conversionkernels.h"
 
+#include <algorithm>  // std::min
+#include <cstdint>    // std::uintptr_t
+
 #include "vrkframework/basic/core/kernels/kerneltables.h"
 
 namespace typeconv::detail {
@@ -11,10 +14,22 @@ constexpr std::size_t Log2(std::size_t size) {
     return size == 1 ? 0 : size == 2 ? 1 : size == 4 ? 2 : 3;
 }
 
-/// Real to complex conversions go through a small block that stays in the first-level
-/// cache: contiguous conversion, then interleaving with zeros, so every pair shares the
-/// contiguous kernels.
+/// The output of a block: small enough to stay in the first-level cache between its
+/// writing and its copying out (real to complex conversions write the real values there
+/// first and interleave them with zeros, so that every pair shares the contiguous kernels).
 constexpr std::size_t kBlockBytes = 8192;
+constexpr std::size_t kLineBytes = 64;
+
+enum class Side { kInput, kOutput };
+
+/// The bytes of one sample of a layout's input or output: complex samples take two values.
+constexpr std::size_t SampleBytes(SampleLayout layout, std::size_t component, Side side) {
+    const bool complex =
+        side == Side::kInput
+            ? layout == SampleLayout::kComplex || layout == SampleLayout::kComplexToReal
+            : layout == SampleLayout::kComplex || layout == SampleLayout::kRealToComplex;
+    return (complex ? 2 : 1) * kComponentSizes[component];
+}
 
 }  // namespace
 
@@ -37,30 +52,55 @@ void FillGaps(KernelSet& kernels, const KernelSet& before) {
 
 void RunPromote(const KernelSet& kernels, SampleLayout layout, std::size_t from, std::size_t to,
                 const void* src, void* dst, std::size_t count) {
+    const bool copyOut = count * SampleBytes(layout, to, Side::kOutput) >= kCopyOutBytes;
     const ConvertKernel convert = kernels.convert[from][to];
-    switch (layout) {
-        case SampleLayout::kReal:
-            convert(src, dst, count);
-            return;
-        case SampleLayout::kComplex:
-            convert(src, dst, 2 * count);
-            return;
-        case SampleLayout::kComplexToReal:
-            kernels.convertRealParts[from][to](src, dst, count);
-            return;
-        case SampleLayout::kRealToComplex:
-            break;
+    if (copyOut || layout == SampleLayout::kRealToComplex) {
+        RunPromoteInBlocks(kernels, layout, from, to, src, dst, count, copyOut);
+    } else if (layout == SampleLayout::kReal) {
+        convert(src, dst, count);
+    } else if (layout == SampleLayout::kComplex) {
+        convert(src, dst, 2 * count);
+    } else {
+        kernels.convertRealParts[from][to](src, dst, count);
     }
-    const std::size_t fromSize = kComponentSizes[from];
-    const std::size_t toSize = kComponentSizes[to];
-    const std::size_t blockCount = kBlockBytes / toSize;
+}
+
+void RunPromoteInBlocks(const KernelSet& kernels, SampleLayout layout, std::size_t from,
+                        std::size_t to, const void* src, void* dst, std::size_t count,
+                        bool copyOut) {
+    const std::size_t inSize = SampleBytes(layout, from, Side::kInput);
+    const std::size_t outSize = SampleBytes(layout, to, Side::kOutput);
+    const std::size_t blockCount = kBlockBytes / outSize;
     alignas(64) unsigned char block[kBlockBytes];
-    const auto* in = static_cast<const unsigned char*>(src);
-    auto* out = static_cast<unsigned char*>(dst);
-    for (std::size_t done = 0; done < count; done += blockCount) {
-        const std::size_t n = count - done < blockCount ? count - done : blockCount;
-        convert(in + done * fromSize, block, n);
-        kernels.interleaveWithZeros[Log2(toSize)](block, out + 2 * done * toSize, n);
+    alignas(64) unsigned char values[kBlockBytes / 2];  // real values before interleaving
+    // The first block ends where the destination reaches a cache line, so that the blocks
+    // after it are copied out in whole lines.
+    const std::size_t toLine =
+        (kLineBytes - reinterpret_cast<std::uintptr_t>(dst) % kLineBytes) % kLineBytes;
+    std::size_t n = toLine != 0 && toLine % outSize == 0 ? toLine / outSize : blockCount;
+    for (std::size_t done = 0; done < count; done += n, n = blockCount) {
+        n = std::min(n, count - done);
+        const unsigned char* in = static_cast<const unsigned char*>(src) + done * inSize;
+        unsigned char* out = static_cast<unsigned char*>(dst) + done * outSize;
+        unsigned char* target = copyOut ? block : out;
+        switch (layout) {
+            case SampleLayout::kReal:
+                kernels.convert[from][to](in, target, n);
+                break;
+            case SampleLayout::kComplex:
+                kernels.convert[from][to](in, target, 2 * n);
+                break;
+            case SampleLayout::kComplexToReal:
+                kernels.convertRealParts[from][to](in, target, n);
+                break;
+            case SampleLayout::kRealToComplex:
+                kernels.convert[from][to](in, values, n);
+                kernels.interleaveWithZeros[Log2(kComponentSizes[to])](values, target, n);
+                break;
+        }
+        if (copyOut) {
+            kernels.copyOut(block, out, n * outSize);
+        }
     }
 }
 

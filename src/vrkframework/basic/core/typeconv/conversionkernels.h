@@ -20,6 +20,8 @@ using UnpackKernel = void (*)(const unsigned char* packed, void* samples, std::s
 /// `count` whole-byte samples into a packed stream of `bits`-bit samples.
 using PackKernel = void (*)(const void* samples, unsigned char* packed, std::size_t count,
                             unsigned int bits);
+/// `bytes` bytes from a block in the first-level cache to memory, past the caches.
+using CopyOutKernel = void (*)(const void* block, void* dst, std::size_t bytes);
 
 /// Every conversion kernel of one kernel variant; a null entry is taken from the variant
 /// before it.
@@ -33,6 +35,7 @@ struct KernelSet {
     /// [component index]: null for float and double.
     std::array<UnpackKernel, kComponentCount> unpack;
     std::array<PackKernel, kComponentCount> pack;
+    CopyOutKernel copyOut;
 };
 
 /// Replaces every null kernel of `kernels` by the one of `before`.
@@ -41,9 +44,21 @@ void FillGaps(KernelSet& kernels, const KernelSet& before);
 /// The conversion kernels of the kernel variant in use.
 const KernelSet& ActiveKernels();
 
-/// Runs the conversion of `count` samples of a family's layout.
+/// Conversions whose output is at least this large write it past the caches: so large a
+/// result would leave the caches before it is read again, and writing it past them saves
+/// the reading of every destination line before it is overwritten.
+constexpr std::size_t kCopyOutBytes = std::size_t{4} << 20;
+
+/// Runs the conversion of `count` samples of a family's layout: through RunPromoteInBlocks
+/// with `copyOut` set when the output takes at least kCopyOutBytes.
 void RunPromote(const KernelSet& kernels, SampleLayout layout, std::size_t from, std::size_t to,
                 const void* src, void* dst, std::size_t count);
+
+/// Runs the conversion block by block through a buffer in the first-level cache, each block
+/// then copied to `dst`, past the caches where `copyOut` is set.
+void RunPromoteInBlocks(const KernelSet& kernels, SampleLayout layout, std::size_t from,
+                        std::size_t to, const void* src, void* dst, std::size_t count,
+                        bool copyOut);
 
 /// Reports a null source or destination for a conversion that has samples to convert
 /// (kora::DataException): no buffer can be read or written at a null address.

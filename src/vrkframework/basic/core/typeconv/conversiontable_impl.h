@@ -8,6 +8,7 @@
 #include <type_traits>
 #include <utility>  // std::index_sequence
 
+#include "vrkframework/basic/core/kernels/streamingcopy_impl.h"
 #include "vrkframework/basic/core/typeconv/componenttraits.h"
 #include "vrkframework/basic/core/typeconv/conversionkernels.h"
 #include "vrkframework/basic/core/typeconv/elementkernels_impl.h"
@@ -55,6 +56,7 @@ constexpr KernelSet MakeKernelSet(std::index_sequence<Index...> indices) {
                                             &InterleaveWithZeros<std::uint64_t>}},
         {{SelectUnpackKernel<Component<Index>>()...}},
         {{SelectPackKernel<Component<Index>>()...}},
+        &kora::kubo::detail::CopyBypassingCaches,
     };
 }
 
