@@ -6,6 +6,7 @@
 #include <cstdint>    // std::uintptr_t
 
 #include "vrkframework/basic/core/kernels/kerneltables.h"
+#include "vrkframework/basic/core/kernels/prefetch.h"
 
 namespace typeconv::detail {
 namespace {
@@ -83,6 +84,10 @@ void RunPromoteInBlocks(const KernelSet& kernels, SampleLayout layout, std::size
         const unsigned char* in = static_cast<const unsigned char*>(src) + done * inSize;
         unsigned char* out = static_cast<unsigned char*>(dst) + done * outSize;
         unsigned char* target = copyOut ? block : out;
+        if (copyOut) {
+            const std::size_t next = std::min(blockCount, count - done - n);
+            kora::kubo::detail::PrefetchForReading(in + n * inSize, next * inSize);
+        }
         switch (layout) {
             case SampleLayout::kReal:
                 kernels.convert[from][to](in, target, n);

@@ -7,6 +7,7 @@
 #include <utility>    // std::move
 #include <vector>
 
+#include "vrkframework/basic/core/kernels/prefetch.h"
 #include "vrkframework/basic/kubo/masks/nodatarequest.h"
 #include "vrkframework/basic/kubo/masks/pixelflags.h"
 #include "vrkframework/basic/kubo/raster/bufferextent.h"
@@ -116,6 +117,13 @@ void MaskDecision::EvaluateRange(const Raster& raster, std::uint64_t first, std:
             const std::uint64_t pixelBytes = m_pixelStride * sampleBytes;
             const unsigned char* start =
                 raster.data == nullptr ? nullptr : raster.data + first * pixelBytes;
+            if (start != nullptr) {
+                // Ranges are mostly evaluated in order: the next one is read meanwhile.
+                const std::uint64_t next =
+                    std::min<std::uint64_t>(evaluated, readable - first - evaluated);
+                detail::PrefetchForReading(start + evaluated * pixelBytes,
+                                           static_cast<std::size_t>(next * pixelBytes));
+            }
             m_impl->Evaluate(start, flags, evaluated);
             if (m_reachesNextPixel && first + evaluated < readable) {
                 // The kernel took the range's last pixel for the buffer's last; its half pair
