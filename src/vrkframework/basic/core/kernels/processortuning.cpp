@@ -29,7 +29,9 @@ struct FamilyTuning {
 /// AMD family 25 (Zen 4) runs 512-bit vectors in two 256-bit halves: conversions between
 /// integer types streamed out of cache faster from the 256-bit kernels there. Family 26 (Zen
 /// 5), with full-width units, measured the 512-bit kernels at or ahead on every pair (up to
-/// four times faster for the narrowings from 64-bit integers in cache).
+/// four times faster for the narrowings from 64-bit integers in cache). Intel family 6
+/// (model 207) ran the 256-bit kernels faster on 1 of 56 integer pairs out of cache and 7
+/// in cache, by at most 23 %, against a median gain of 20 % for the 512-bit ones: no row.
 constexpr FamilyTuning kFamilyTunings[] = {
     {true, 25, 512, FromBelow::kIntegerConversions},
 };
