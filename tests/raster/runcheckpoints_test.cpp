@@ -74,9 +74,15 @@ TEST(RunCheckpoints, AnyDistanceAheadAgreesWithAWalkOverAllOfThem) {
                     expected = at;
                 }
             }
-            const Checkpoint found = checkpoints.LastWithin(limit, pastRun);
-            ASSERT_EQ(found.run, expected.run) << pastRun << " " << limit;
-            ASSERT_EQ(found.total, expected.total) << pastRun << " " << limit;
+            // A guess of where the target lies, right or wrong, ahead, behind or past the
+            // end, changes nothing.
+            for (const std::size_t nearRun :
+                 {std::size_t{0}, pastRun / 2, pastRun + 7 * kSpacing, expected.run,
+                  expected.run + kSpacing, runs.size() + kSpacing}) {
+                const Checkpoint found = checkpoints.LastWithin(limit, pastRun, nearRun);
+                ASSERT_EQ(found.run, expected.run) << pastRun << " " << limit << " " << nearRun;
+                ASSERT_EQ(found.total, expected.total) << pastRun << " " << limit;
+            }
         }
     }
 }

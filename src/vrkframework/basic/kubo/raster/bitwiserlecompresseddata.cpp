@@ -10,6 +10,7 @@
 #include "vrkframework/basic/kubo/raster/runs/alternatingruns.h"
 #include "vrkframework/basic/kubo/raster/runs/bytesink.h"
 #include "vrkframework/basic/kubo/raster/runs/decodedbytes.h"
+#include "vrkframework/basic/kubo/raster/runs/rowprefetch.h"
 #include "vrkframework/basic/kubo/raster/runs/runcheckpoints.h"
 #include "vrkframework/basic/kubo/raster/runs/wordscan.h"
 #include "vrkframework/platform/exception.h"
@@ -83,7 +84,11 @@ class Reader {
 public:
     Reader(const unsigned char* runs, std::size_t size, const detail::RunCheckpoints& checkpoints,
            const Cursor& cursor)
-        : m_runs(runs), m_size(size), m_checkpoints(checkpoints), m_cursor(cursor) {}
+        : m_runs(runs),
+          m_size(size),
+          m_checkpoints(checkpoints),
+          m_cursor(cursor),
+          m_prefetch(runs, size, 1, checkpoints) {}
 
     /// The cursor at the first bit of a stream.
     static Cursor Start(const unsigned char* runs) { return Cursor{0, 0, runs[0], 0, false}; }
@@ -92,6 +97,7 @@ public:
 
     void Read(std::uint64_t byteOffset, std::uint64_t byteCount, unsigned char* dst) {
         Seek(byteOffset * 8);
+        m_prefetch.RowStarts(m_cursor.runIndex);
         // The bits go out run by run. A run is entered only when a bit of it is read, so the
         // cursor ends in the run that holds the last bit read, as read bit by bit. Runs that
         // a separator joins go out as one stretch.
@@ -130,6 +136,7 @@ public:
             throw;
         }
         writer.Finish();
+        m_prefetch.RowEnds(m_cursor.runIndex);
     }
 
 private:
@@ -209,7 +216,8 @@ private:
         if (bit == 0) {
             return;
         }
-        const auto checkpoint = m_checkpoints.LastWithin(bit - 1, m_cursor.runIndex);
+        const auto checkpoint =
+            m_checkpoints.LastWithin(bit - 1, m_cursor.runIndex, m_prefetch.NextRow());
         if (checkpoint.run > m_cursor.runIndex) {
             EnterRun(checkpoint.run, checkpoint.total, detail::RunValue(checkpoint.run));
         }
@@ -228,6 +236,7 @@ private:
     std::size_t m_size;
     const detail::RunCheckpoints& m_checkpoints;
     Cursor m_cursor;
+    detail::RowPrefetch m_prefetch;
 };
 
 }  // namespace

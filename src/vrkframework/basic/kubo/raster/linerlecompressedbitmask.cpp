@@ -9,6 +9,7 @@
 #include <utility>    // std::move
 #include <vector>
 
+#include "vrkframework/basic/core/kernels/prefetch.h"
 #include "vrkframework/basic/kubo/raster/bufferextent.h"
 #include "vrkframework/basic/kubo/raster/count32.h"
 #include "vrkframework/basic/kubo/raster/runs/alternatingruns.h"
@@ -51,6 +52,9 @@ struct RowRuns {
 /// runs: at least one, and 8 bytes per KiB of runs (0.78 %).
 constexpr std::size_t kIndexedRowRuns = 2 * detail::kStreamBytesPerCheckpoint;
 
+/// At most this many bytes of a row's runs, and of its checkpoints, are asked for ahead.
+constexpr std::size_t kPrefetchBytes = 2048;
+
 constexpr std::size_t CheckpointCount(std::size_t runCount) {
     return runCount >= kIndexedRowRuns ? (runCount - 1) / detail::kStreamBytesPerCheckpoint : 0;
 }
@@ -74,10 +78,9 @@ inline RunEnd FindPixel(const RowRuns& row, std::uint64_t start) {
     for (; runCount - run >= 8; run += 8) {
         const std::uint64_t eight = detail::SumOfEightBytes(runs + run);
         if (sum + eight >= start) {
-            do {
-                sum += runs[run++];
-            } while (sum < start);
-            return {run, sum};
+            std::uint64_t taken;
+            run += detail::CountsToReach(runs + run, start - sum, taken);
+            return {run, sum + taken};
         }
         sum += eight;
     }
@@ -90,10 +93,16 @@ inline RunEnd FindPixel(const RowRuns& row, std::uint64_t start) {
     return {run, sum};
 }
 
+/// The runs a decode read: from the one that holds its first pixel to the one after its last.
+struct RunsRead {
+    std::size_t first;
+    std::size_t end;
+};
+
 // Writes pixels start to start + count - 1 of a row, one byte (0 or 1) each. Calls stay
 // inside this file, so that they are direct.
-inline void DecodeRuns(const RowRuns& row, std::uint64_t start, std::uint64_t count,
-                       unsigned char* out) {
+inline RunsRead DecodeRuns(const RowRuns& row, std::uint64_t start, std::uint64_t count,
+                           unsigned char* out) {
     const unsigned char* runs = row.runs;
     const std::size_t runCount = row.size;
     std::size_t run = 0;
@@ -107,6 +116,7 @@ inline void DecodeRuns(const RowRuns& row, std::uint64_t start, std::uint64_t co
     } else if (runCount != 0) {
         length = runs[run++];
     }
+    const std::size_t first = run == 0 ? 0 : run - 1;
     std::uint64_t left = count;
     for (;;) {
         // A 0 run after a run of 255 continues the value.
@@ -116,14 +126,14 @@ inline void DecodeRuns(const RowRuns& row, std::uint64_t start, std::uint64_t co
         }
         if (length >= left) {
             detail::FillBytes(out, value, static_cast<std::size_t>(left));
-            return;
+            return {first, run};
         }
         detail::FillBytes(out, value, static_cast<std::size_t>(length));
         out += length;
         left -= length;
         if (run >= runCount) {
             detail::FillBytes(out, 0, static_cast<std::size_t>(left));  // past the runs: clear
-            return;
+            return {first, run};
         }
         value = detail::RunValue(run);
         length = runs[run++];
@@ -358,11 +368,24 @@ void LineRLECompressedBitMask::DecodeWindow(int x, int y, int w, int h, unsigned
     // last one; the sum is 64-bit so that it cannot wrap.
     const std::uint64_t spacing = count * GetBytesPerPixel();
     const RowTable& table = *m_rows;
+    // The rows of a window lie apart in memory, each in lines no row before it touched; the
+    // next row's window usually starts at about the same run as this row's and reads about
+    // as many, so those runs and the next row's checkpoints are asked for while this row
+    // decodes.
+    RunsRead last{0, 0};
     std::uint64_t o = 0;
     for (long long row = y; row < static_cast<long long>(y) + h && o < capacity;
          ++row, o += spacing) {
-        DecodeRuns(table.Runs(static_cast<std::uint64_t>(row)), static_cast<std::uint64_t>(x),
-                   std::min(count, capacity - o), out + o);
+        const RowRuns next = table.Runs(static_cast<std::uint64_t>(row) + 1);
+        if (last.first < next.size) {
+            detail::PrefetchForReading(
+                next.runs + last.first,
+                std::min({last.end - last.first + 1, next.size - last.first, kPrefetchBytes}));
+            detail::PrefetchForReading(
+                next.totals, std::min(next.totalCount * sizeof *next.totals, kPrefetchBytes));
+        }
+        last = DecodeRuns(table.Runs(static_cast<std::uint64_t>(row)),
+                          static_cast<std::uint64_t>(x), std::min(count, capacity - o), out + o);
     }
 }
 

@@ -8,6 +8,7 @@
 #include "vrkframework/basic/kubo/raster/count32.h"
 #include "vrkframework/basic/kubo/raster/runs/bytesink.h"
 #include "vrkframework/basic/kubo/raster/runs/decodedbytes.h"
+#include "vrkframework/basic/kubo/raster/runs/rowprefetch.h"
 #include "vrkframework/basic/kubo/raster/runs/runcheckpoints.h"
 #include "vrkframework/basic/kubo/raster/runs/wordscan.h"
 #include "vrkframework/platform/exception.h"
@@ -305,22 +306,28 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
     // The counts of the pairs before `pair` while it lies in the stream. The running total
     // drifts from it by the row rule below, and the drift stays the same while seeking.
     std::uint64_t passed = 0;
+    detail::RowPrefetch prefetch(m_buffer.get(), pairs.Size(), 2, checkpoints);
     for (std::size_t o = 0; h > 0 && o < capacity; --h, o += rowBytes, start += stride) {
         // Seek: add counts until the total passes the row's start. Whole stretches of
         // pairs go at once while the total stays at or below it: first up to the last
         // checkpoint that keeps it so, then sixty-four and sixteen pairs at a time, then
         // four at a time up to the pair that passes. A block that does not fit does not fit
         // from any later pair either (no count is negative), so each size is given up for
-        // the next at its first failure. Past the stream nothing is added.
+        // the next at its first failure. Past the stream nothing is added. Where the rows
+        // before guess the row's start less than sixty-four pairs ahead, that size is not
+        // tried: it would only fail.
         if (total <= start && pair < pairs.Size()) {
             std::uint64_t room = start - total;
+            const std::size_t guess = prefetch.NextRow();
             const auto checkpoint = checkpoints.LastWithin(
-                passed > UINT64_MAX - room ? UINT64_MAX : passed + room, pair);
+                passed > UINT64_MAX - room ? UINT64_MAX : passed + room, pair, guess);
             if (checkpoint.run > pair) {
                 room -= checkpoint.total - passed;
                 pair = checkpoint.run;
             }
-            pairs.SkipBlocks<16>(pair, room);
+            if (guess == 0 || guess - pair >= 64) {  // also a guess behind, which wraps
+                pairs.SkipBlocks<16>(pair, room);
+            }
             pairs.SkipBlocks<4>(pair, room);
             for (unsigned int fit = 4; fit == 4 && pairs.Size() - pair >= 4;) {
                 std::uint64_t sum;
@@ -342,6 +349,7 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
         unsigned char value = pairs.Value(pair);
         total -= pairs.Count(pair);
         passed -= pairs.Count(pair);
+        prefetch.RowStarts(pair);
 
         unsigned char* row = out + o;
         for (std::size_t left = std::min(rowBytes, capacity - o); left > 0;) {
@@ -382,6 +390,7 @@ void RLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned char* 
             left -= run;
             remaining -= run;
         }
+        prefetch.RowEnds(pair);
     }
 }
 

@@ -8,6 +8,8 @@
 #include <cstdint>    // std::uint32_t, std::uint64_t
 #include <vector>
 
+#include "vrkframework/basic/core/kernels/prefetch.h"
+
 namespace kora::kubo::detail {
 
 /// Rows of a row mask index themselves every 1 KiB of runs with a 64-bit total each: 8 bytes
@@ -88,13 +90,20 @@ public:
 
     /// The last checkpoint after run `pastRun` whose total is at most `limit`, or the first
     /// run (total 0) when none is. A walk standing at `pastRun` asks in constant time whether
-    /// a checkpoint lies between it and its target.
-    Checkpoint LastWithin(std::uint64_t limit, std::size_t pastRun = 0) const {
+    /// a checkpoint lies between it and its target. `nearRun`, when ahead of `pastRun`, is a
+    /// guess of where the target lies: the search starts there when its checkpoint is within
+    /// the limit, and ends after one more comparison when the guess is right.
+    Checkpoint LastWithin(std::uint64_t limit, std::size_t pastRun = 0,
+                          std::size_t nearRun = 0) const {
         // Checkpoint b stands at run (b + 1) x spacing.
         const std::size_t count = m_offsets.size();
-        const std::size_t first = std::min(pastRun >> m_spacingBits, count);
+        std::size_t first = std::min(pastRun >> m_spacingBits, count);
         if (first == count || Total(first) > limit) {
             return Checkpoint{0, 0};
+        }
+        const std::size_t guess = nearRun >> m_spacingBits;
+        if (guess > first && guess < count && Total(guess) <= limit) {
+            first = guess;
         }
         // The target usually lies a few checkpoints ahead: steps that double from the walk's
         // own checkpoint bracket it, and halving steps search that bracket only, always
@@ -111,6 +120,16 @@ public:
             left -= half;
         }
         return Checkpoint{(checkpoint + 1) << m_spacingBits, Total(checkpoint)};
+    }
+
+    /// Asks for the checkpoint that a search guessing `nearRun` reads first to be brought
+    /// into the cache.
+    void PrefetchNear(std::size_t nearRun) const {
+        const std::size_t guess = nearRun >> m_spacingBits;
+        if (guess < m_offsets.size()) {
+            PrefetchForReading(&m_offsets[guess], sizeof m_offsets[guess]);
+            PrefetchForReading(&m_bases[guess >> kCheckpointGroupBits], sizeof(std::uint64_t));
+        }
     }
 
 private:
