@@ -1,7 +1,7 @@
 // Compresses arbitrary bytes as bit runs; every decoder must give them back: whole, and
-// windows in any order through the one read cursor (rows read as bytes, placed by
-// pixels), failing only where the rules say so: outside the raster, and for a row that
-// starts inside the last run or before the stream.
+// windows in any order or side by side through the one read cursor (rows read as bytes,
+// placed by pixels), failing only where the rules say so: outside the raster, and for a
+// row that starts inside the last run or before the stream.
 #include <algorithm>
 #include <cstddef>
 #include <cstdint>
@@ -59,11 +59,20 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     };
     const long long width = info.width;
     const long long height = info.height;
+    int lastX = 0;
+    int lastY = 0;
+    int lastW = 0;
     for (int i = 0; i < 6; ++i) {
-        const int x = pick(-2, width + 1);
-        const int y = pick(-1, height);
+        // Every other window starts where the last one ended, on the same rows, as tiles
+        // decoded side by side do.
+        const bool beside = i % 2 == 1 && lastW > 0;
+        const int x = beside ? lastX + lastW : pick(-2, width + 1);
+        const int y = beside ? lastY : pick(-1, height);
         const int w = pick(-1, width + 1);
         const int h = pick(-1, height + 1);
+        lastX = x;
+        lastY = y;
+        lastW = w;
         const bool inside = y < height && y + h <= height && x < width && x + w <= width;
         const long long rowBytes = std::max(w, 0);
         const long long rows = std::max(h, 0);

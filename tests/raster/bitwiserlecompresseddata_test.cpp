@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <random>
 
 #include "support/compressedsamples.h"
@@ -131,6 +132,18 @@ TEST(BitwiseRLECompressedData, WindowsOfOneByteSamplesAreSlicesInAnyOrder) {
             out.pop_back();
             ASSERT_EQ(out, expected) << x << ' ' << y << ' ' << w << ' ' << h;
         }
+        // Tiles side by side, row by row: each row of a tile starts where the same row of
+        // the tile to its left ended.
+        for (unsigned int y = 0; y < height; y += 8) {
+            for (unsigned int x = 0; x < width; x += 16) {
+                const unsigned int w = std::min(16u, width - x);
+                const unsigned int h = std::min(8u, height - y);
+                ASSERT_EQ(Window(data, static_cast<int>(x), static_cast<int>(y),
+                                 static_cast<int>(w), static_cast<int>(h), w * h),
+                          kubo_test::Slice(bytes, width, x, y, w, h))
+                    << x << ' ' << y;
+            }
+        }
         // The same window twice: the second decode seeks backwards from where the first
         // ended.
         const Bytes first = Window(data, 3, 2, 40, 15, 40 * 15);
@@ -254,6 +267,17 @@ TEST(BitwiseRLECompressedData, ASeekIntoTheMiddleOfTheLastRunJumpsPastItAndFails
     kubo_test::ExpectReport(*failure, "Uncompressed index not found.", kSource,
                             "void __cdecl kora::kubo::BitwiseRLECompressedData::Jump(void) const",
                             343);
+
+    // A row that starts where the cursor stands inside the last run reads on; once the
+    // cursor has moved elsewhere, the same row fails again, although a row of an earlier
+    // window ended there.
+    Bytes rows(80, 0x5A);
+    std::copy(bits.begin(), bits.end(), rows.begin() + 40);
+    const BitwiseRLECompressedData two = Compress8U(rows, 40, 2);
+    EXPECT_EQ(Window(two, 32, 1, 1, 1, 1), Bytes{0x80});
+    EXPECT_EQ(Window(two, 33, 1, 1, 1, 1), Bytes{0});
+    EXPECT_EQ(Window(two, 0, 0, 1, 1, 1), Bytes{0x5A});
+    EXPECT_TRUE(kubo_test::Catch<kora::DataException>([&] { Window(two, 34, 1, 1, 1, 1); }));
 }
 
 }  // namespace

@@ -6,6 +6,7 @@
 #include <cstddef>  // std::size_t
 #include <cstdint>  // std::uint32_t, std::uint64_t
 #include <memory>   // std::shared_ptr
+#include <vector>
 
 #include "vrkframework/basic/kubo/kuboapi.h"
 #include "vrkframework/basic/kubo/raster/datatype.h"
@@ -102,6 +103,10 @@ private:
     RasterInfo m_info;
     std::shared_ptr<const detail::RunCheckpoints> m_checkpoints;  ///< made with the stream
     mutable detail::BitRunCursor m_cursor;
+    /// Where the last read of each row (up to 512 rows, by row modulo 512) stopped, made on
+    /// the first window decode: a window that starts there takes up that cursor instead of
+    /// seeking.
+    mutable std::vector<detail::BitRunCursor> m_rowEnds;
 };
 
 }  // namespace kora::kubo

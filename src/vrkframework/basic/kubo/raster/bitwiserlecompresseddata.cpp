@@ -76,6 +76,10 @@ private:
 
 using Cursor = detail::BitRunCursor;
 
+// Rows whose last read end each object keeps, for a window that starts where the window to
+// its left ended: rows a multiple of this apart share a slot.
+constexpr std::size_t kRowEndSlots = 512;
+
 // The read cursor at work. It moves a copy of the object's cursor, which the compiler keeps
 // in registers (the members themselves would make a round trip through memory at every run,
 // since the bytes written may alias them), and the window decoder stores it back at the end,
@@ -95,8 +99,23 @@ public:
 
     const Cursor& Where() const { return m_cursor; }
 
+    /// Takes up `end`, where an earlier read stopped, when it stands exactly at `bit` and
+    /// a run starts after it: the seek from the cursor would then succeed (a cursor past
+    /// the last run stands at the end of the stream, after the bit, and starts over) and
+    /// end in the run that holds the bit or at the start of the next one, which read the
+    /// same bits from there and leave the same cursor as `end` does.
+    void ResumeAt(const Cursor& end, std::uint64_t bit) {
+        if (end.position == bit && end.runIndex + 1 < m_size) {
+            m_cursor = end;
+        }
+    }
+
     void Read(std::uint64_t byteOffset, std::uint64_t byteCount, unsigned char* dst) {
-        Seek(byteOffset * 8);
+        // A cursor inside the stream that stands at the bit already stays: the seek would
+        // move nothing.
+        if (m_cursor.position != byteOffset * 8 || m_cursor.runIndex >= m_size) {
+            Seek(byteOffset * 8);
+        }
         m_prefetch.RowStarts(m_cursor.runIndex);
         // The bits go out run by run. A run is entered only when a bit of it is read, so the
         // cursor ends in the run that holds the last bit read, as read bit by bit. Runs that
@@ -347,12 +366,19 @@ void BitwiseRLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned
         rowBytes * ((m_info.dataType.bits + 7u) / 8u) * std::size_t{m_info.channels};
     const std::uint64_t lineSize = GetLineSize();
     Reader reader(m_buffer.get(), m_size, *m_checkpoints, m_cursor);
+    // Windows side by side: where a row of the window to the left ended, this one starts.
+    m_rowEnds.resize(kRowEndSlots, Cursor{0, UINT64_MAX, 0, 0, false});
     try {
         std::size_t o = 0;
         for (long long row = y; row < static_cast<long long>(y) + h && o < capacity;
              ++row, o += spacing) {
-            reader.Read(static_cast<std::uint64_t>(row) * lineSize + static_cast<std::uint64_t>(x),
-                        static_cast<std::uint64_t>(std::min(rowBytes, capacity - o)), out + o);
+            const std::uint64_t offset =
+                static_cast<std::uint64_t>(row) * lineSize + static_cast<std::uint64_t>(x);
+            Cursor& rowEnd = m_rowEnds[static_cast<std::uint64_t>(row) % kRowEndSlots];
+            reader.ResumeAt(rowEnd, offset * 8);
+            reader.Read(offset, static_cast<std::uint64_t>(std::min(rowBytes, capacity - o)),
+                        out + o);
+            rowEnd = reader.Where();
         }
     } catch (...) {
         m_cursor = reader.Where();
