@@ -78,9 +78,10 @@ inline RunEnd FindPixel(const RowRuns& row, std::uint64_t start) {
     for (; runCount - run >= 8; run += 8) {
         const std::uint64_t eight = detail::SumOfEightBytes(runs + run);
         if (sum + eight >= start) {
-            std::uint64_t taken;
-            run += detail::CountsToReach(runs + run, start - sum, taken);
-            return {run, sum + taken};
+            do {
+                sum += runs[run++];
+            } while (sum < start);
+            return {run, sum};
         }
         sum += eight;
     }
@@ -368,16 +369,17 @@ void LineRLECompressedBitMask::DecodeWindow(int x, int y, int w, int h, unsigned
     // last one; the sum is 64-bit so that it cannot wrap.
     const std::uint64_t spacing = count * GetBytesPerPixel();
     const RowTable& table = *m_rows;
-    // The rows of a window lie apart in memory, each in lines no row before it touched; the
-    // next row's window usually starts at about the same run as this row's and reads about
-    // as many, so those runs and the next row's checkpoints are asked for while this row
-    // decodes.
+    // The rows of a window lie apart in memory, each in lines no row before it touched; in
+    // rows long enough to keep checkpoints, the next row's window usually starts at about
+    // the same run as this row's and reads about as many, so those runs and the next row's
+    // checkpoints are asked for while this row decodes. Shorter rows are read from their
+    // start, whose lines the hardware fetches on its own.
     RunsRead last{0, 0};
     std::uint64_t o = 0;
     for (long long row = y; row < static_cast<long long>(y) + h && o < capacity;
          ++row, o += spacing) {
         const RowRuns next = table.Runs(static_cast<std::uint64_t>(row) + 1);
-        if (last.first < next.size) {
+        if (next.totalCount != 0 && last.first < next.size) {
             detail::PrefetchForReading(
                 next.runs + last.first,
                 std::min({last.end - last.first + 1, next.size - last.first, kPrefetchBytes}));

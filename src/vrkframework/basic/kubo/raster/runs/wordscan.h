@@ -55,25 +55,6 @@ inline std::uint64_t SumOfEightBytes(const unsigned char* bytes) {
     return (pairs * 0x0001000100010001ull) >> 48;
 }
 
-/// How many of the 8 counts at `counts` are added, one after the other from 0, up to and
-/// including the first that brings the sum to `need` (> 0) or past it, and their sum in
-/// `sum`; all 8 when none does. Without branches: where the walk stops is data, and a
-/// mispredicted exit costs more than the 8 steps.
-inline unsigned int CountsToReach(const unsigned char* counts, std::uint64_t need,
-                                  std::uint64_t& sum) {
-    std::uint64_t before = 0;  // the sum of the counts before the k-th
-    std::uint64_t taken = 0;
-    unsigned int count = 0;
-    for (unsigned int k = 0; k < 8; ++k) {
-        const bool take = before < need;
-        taken += take ? counts[k] : 0u;
-        count += take ? 1u : 0u;
-        before += counts[k];
-    }
-    sum = taken;
-    return count;
-}
-
 /// The sum of the kCount bytes at `bytes`, a count small enough for the sum to fit 16 bits:
 /// the loop vectorises in 16-bit lanes, twice as many per vector as 32-bit ones.
 template <std::size_t kCount>
