@@ -29,49 +29,65 @@ constexpr char kWindowDecode[] =
     "void __cdecl kora::kubo::BitwiseRLECompressedData::Decode(int,int,int,int,unsigned char *) "
     "const";
 
-// Writes runs of bits into bytes, most significant bit first: bits gather in a word, and
-// whole words of one value go out as one fill.
+// Writes runs of bits into bytes, most significant bit first. A run costs one mark, at the
+// bit where the value changes; a word of output is the running parity of its marks from the
+// most significant bit on, flipped when the word starts set. Busy data, whose runs are a few
+// bits long, then takes a handful of operations a run. Bits of one value only add to a
+// count until the value changes: a long stretch goes out as one fill.
 class BitWriter {
 public:
     explicit BitWriter(unsigned char* out) : m_out(out) {}
 
+    /// Appends `length` bits of `value`.
     void Put(std::uint64_t length, bool value) {
-        while (length > 0) {
-            if (m_filled == 0 && length >= 64) {
-                const auto bytes = static_cast<std::size_t>(length / 64 * 8);
-                std::memset(m_out, value ? 0xFF : 0, bytes);
-                m_out += bytes;
-                length %= 64;
-                continue;
+        if (value != m_value) {
+            if (m_filled >= 64) {
+                Spill();
             }
-            const auto take =
-                static_cast<unsigned int>(std::min<std::uint64_t>(length, 64 - m_filled));
-            if (value) {
-                m_word |= (~std::uint64_t{0} >> (64 - take)) << (64 - m_filled - take);
-            }
-            m_filled += take;
-            length -= take;
-            if (m_filled == 64) {
-                Store(8);
-            }
+            m_marks ^= kFirstBit >> m_filled;
+            m_value = value;
         }
+        m_filled += length;
     }
 
     // The stream holds whole bytes, so nothing is left over.
-    void Finish() { Store(m_filled / 8); }
+    void Finish() {
+        if (m_filled >= 64) {
+            Spill();
+        }
+        Store(static_cast<std::size_t>(m_filled / 8));
+    }
 
 private:
-    void Store(unsigned int bytes) {
-        const std::uint64_t ordered = detail::kLittleEndian ? detail::ByteSwap(m_word) : m_word;
+    static constexpr std::uint64_t kFirstBit = std::uint64_t{1} << 63;
+
+    // Writes the full word, then the whole words of the current value after it.
+    void Spill() {
+        Store(8);
+        const auto bytes = static_cast<std::size_t>((m_filled - 64) / 64 * 8);
+        std::memset(m_out, m_value ? 0xFF : 0, bytes);
+        m_out += bytes;
+        m_filled %= 64;
+        m_marks = 0;
+        m_startsSet = m_value;
+    }
+
+    void Store(std::size_t bytes) {
+        std::uint64_t word = m_marks;
+        for (unsigned int shift = 1; shift < 64; shift *= 2) {
+            word ^= word >> shift;
+        }
+        word ^= m_startsSet ? ~std::uint64_t{0} : 0;
+        const std::uint64_t ordered = detail::kLittleEndian ? detail::ByteSwap(word) : word;
         std::memcpy(m_out, &ordered, bytes);
         m_out += bytes;
-        m_word = 0;
-        m_filled = 0;
     }
 
     unsigned char* m_out;
-    std::uint64_t m_word = 0;
-    unsigned int m_filled = 0;
+    std::uint64_t m_marks = 0;   ///< a bit set where the value changes, first bit highest
+    std::uint64_t m_filled = 0;  ///< bits from the word's first on, past its end in a stretch
+    bool m_startsSet = false;    ///< the value at the first bit of the word
+    bool m_value = false;        ///< the value of the last bits put
 };
 
 using Cursor = detail::BitRunCursor;
@@ -118,10 +134,9 @@ public:
         }
         m_prefetch.RowStarts(m_cursor.runIndex);
         // The bits go out run by run. A run is entered only when a bit of it is read, so the
-        // cursor ends in the run that holds the last bit read, as read bit by bit. Runs that
-        // a separator joins go out as one stretch.
+        // cursor ends in the run that holds the last bit read, as read bit by bit: the run
+        // the cursor stands in is read on, then the runs after it that are read whole.
         BitWriter writer(dst);
-        std::uint64_t stretch = 0;
         try {
             for (std::uint64_t left = byteCount * 8; left > 0;) {
                 EnterUnreadRun();
@@ -130,25 +145,11 @@ public:
                 // bit.
                 const auto take = static_cast<std::uint32_t>(
                     unread == 0 ? 1 : std::min<std::uint64_t>(unread, left));
-                stretch += take;
                 m_cursor.consumed += take;
                 m_cursor.position += take;
                 left -= take;
-                // Whole runs after separators join the stretch here, as the steps above
-                // would take them: over the separator, then every bit of the run.
-                while (StretchGoesOn(left) && m_runs[m_cursor.runIndex + 2] != 0 &&
-                       m_runs[m_cursor.runIndex + 2] <= left) {
-                    m_cursor.runIndex += 2;
-                    m_cursor.runLength = m_runs[m_cursor.runIndex];
-                    m_cursor.consumed = m_cursor.runLength;
-                    m_cursor.position += m_cursor.runLength;
-                    stretch += m_cursor.runLength;
-                    left -= m_cursor.runLength;
-                }
-                if (!StretchGoesOn(left)) {
-                    writer.Put(stretch, m_cursor.bitValue);
-                    stretch = 0;
-                }
+                writer.Put(take, m_cursor.bitValue);
+                ReadWholeRuns(left, writer);
             }
         } catch (...) {
             writer.Finish();  // the whole bytes read before the failure are delivered
@@ -159,12 +160,26 @@ public:
     }
 
 private:
-    // Whether the stretch being read goes on: bits are left to read and the run ends at a
-    // separator with a run after it, where the two jumps keep the value and cannot fail, so
-    // nothing is left unwritten when a jump throws.
-    bool StretchGoesOn(std::uint64_t left) const {
-        return left > 0 && m_cursor.consumed == m_cursor.runLength &&
-               m_cursor.runIndex + 2 < m_size && m_runs[m_cursor.runIndex + 1] == 0;
+    // Reads the runs after the cursor's run, which has been read to its end, one mark each,
+    // as long as each lies in the stream and is read whole, and bits are left to read before
+    // it: the steps of the read would enter each (also a separator, whose run after it then
+    // gives the next bit) and read it to its end.
+    void ReadWholeRuns(std::uint64_t& left, BitWriter& writer) {
+        std::size_t run = m_cursor.runIndex;
+        std::uint64_t position = m_cursor.position;
+        bool value = m_cursor.bitValue;
+        while (left > 0 && run + 1 < m_size && m_runs[run + 1] <= left) {
+            const std::uint32_t length = m_runs[++run];
+            value = !value;
+            if (length != 0) {  // a separator: the bits around it join without a change
+                writer.Put(length, value);
+                position += length;
+                left -= length;
+            }
+        }
+        if (run != m_cursor.runIndex) {
+            m_cursor = Cursor{run, position, m_runs[run], m_runs[run], value};
+        }
     }
 
     void Jump() {
