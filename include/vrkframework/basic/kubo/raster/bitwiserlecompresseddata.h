@@ -39,7 +39,9 @@ struct BitRunCursor {
 /// Copies share the runs (they never change after construction) and an index into them
 /// (9 bytes per KiB of runs, made with them) from which the cursor skips
 /// ahead to near the bit it seeks; the last holder releases them. Each object has its own read
-/// cursor, which the window decoder moves although it is const: one object must not be decoded by
+/// cursor, which the window decoder moves although it is const, and remembers where the last read
+/// of each row stopped (16 KiB, made on the first window decode), so that a window decoded beside
+/// the last one starts each row there instead of seeking: one object must not be decoded by
 /// window from two threads at once. Moving copies, so the source stays usable.
 class KUBO_API BitwiseRLECompressedData : public ICompressedData {
 public:
