@@ -34,7 +34,8 @@ public:
         : m_stream(stream),
           m_runCount(runCount),
           m_runBytes(runBytes),
-          m_checkpoints(checkpoints) {}
+          m_checkpoints(checkpoints),
+          m_fetches(runCount * runBytes >= kCachedBytes) {}
 
     /// The run where the next row is guessed to start: 0 (no guess) before two rows started.
     std::size_t NextRow() const { return m_next; }
@@ -43,10 +44,10 @@ public:
     /// next row and asks for its runs and its checkpoint.
     void RowStarts(std::size_t first) {
         m_next = 0;
-        if (m_rows != 0 && first > m_first && first < m_runCount &&
+        if (m_started && first > m_first && first < m_runCount &&
             first - m_first < m_runCount - first) {
             m_next = first + (first - m_first);
-            if (m_runCount * m_runBytes >= kCachedBytes) {
+            if (m_fetches) {
                 const std::size_t bytes =
                     std::min({m_span * m_runBytes, kMaxBytes, (m_runCount - m_next) * m_runBytes});
                 PrefetchForReading(m_stream + m_next * m_runBytes, bytes);
@@ -54,7 +55,7 @@ public:
             }
         }
         m_first = first;
-        ++m_rows;
+        m_started = true;
     }
 
     /// The row that started last ended in run `last`.
@@ -65,10 +66,11 @@ private:
     std::size_t m_runCount;
     std::size_t m_runBytes;
     const RunCheckpoints& m_checkpoints;
+    bool m_fetches;           ///< whether the stream is large enough to fetch ahead
+    bool m_started = false;   ///< whether a row started
     std::size_t m_first = 0;  ///< the run where the last row started
     std::size_t m_span = 0;   ///< the runs the last row read
     std::size_t m_next = 0;
-    std::size_t m_rows = 0;
 };
 
 }  // namespace kora::kubo::detail

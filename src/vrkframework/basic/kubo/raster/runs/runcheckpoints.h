@@ -97,11 +97,11 @@ public:
                           std::size_t nearRun = 0) const {
         // Checkpoint b stands at run (b + 1) x spacing.
         const std::size_t count = m_offsets.size();
-        std::size_t first = std::min(pastRun >> m_spacingBits, count);
+        std::size_t first = std::min(CheckpointAfter(pastRun), count);
         if (first == count || Total(first) > limit) {
             return Checkpoint{0, 0};
         }
-        const std::size_t guess = nearRun >> m_spacingBits;
+        const std::size_t guess = CheckpointAfter(nearRun);
         if (guess > first && guess < count && Total(guess) <= limit) {
             first = guess;
         }
@@ -125,7 +125,7 @@ public:
     /// Asks for the checkpoint that a search guessing `nearRun` reads first to be brought
     /// into the cache.
     void PrefetchNear(std::size_t nearRun) const {
-        const std::size_t guess = nearRun >> m_spacingBits;
+        const std::size_t guess = CheckpointAfter(nearRun);
         if (guess < m_offsets.size()) {
             PrefetchForReading(&m_offsets[guess], sizeof m_offsets[guess]);
             PrefetchForReading(&m_bases[guess >> kCheckpointGroupBits], sizeof(std::uint64_t));
@@ -133,6 +133,9 @@ public:
     }
 
 private:
+    /// The first checkpoint that stands after `run` (past the last when none does).
+    std::size_t CheckpointAfter(std::size_t run) const { return run >> m_spacingBits; }
+
     /// Runs from one checkpoint to the next.
     std::size_t Spacing() const { return std::size_t{1} << m_spacingBits; }
 
