@@ -52,6 +52,7 @@ set(KUBO_SOURCES
   src/vrkframework/basic/kubo/raster/complexrasterinterpretation.cpp
   src/vrkframework/basic/kubo/raster/marginfiller.cpp
   # Colour and lookup tables.
+  src/vrkframework/basic/kubo/luts/breakpointtable.cpp
   src/vrkframework/basic/kubo/luts/lut.cpp
   src/vrkframework/basic/kubo/luts/pct.cpp
   # Ground control points.

@@ -2,8 +2,10 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>  // std::sort
 #include <cmath>
 #include <limits>
+#include <random>
 #include <string>
 #include <vector>
 
@@ -73,6 +75,56 @@ TEST(LUT, EqualInputsAnswerWithTheDirectIndexElseTheFirstOfThem) {
     // 2^32 + 1 keeps the low 32 bits of its truncation: index 1.
     const double big = 4294967297.0;
     EXPECT_EQ(LUT(Entries{{big, 10}, {big, 20}, {big, 30}}).GetValue(big), 20);
+}
+
+// Index of the first entry whose input is not below `x`, walking from the start.
+std::size_t FirstNotBelow(const Entries& entries, double x) {
+    std::size_t j = 0;
+    while (j < entries.size() && entries[j].first < x) {
+        ++j;
+    }
+    return j;
+}
+
+TEST(LUT, SearchesTheFirstBreakpointNotBelowTheInputAtEveryTableSize) {
+    // Outputs are the indices, inputs quarters with repeats (odd sizes end in NaN) and the
+    // inputs looked up odd eighths, which no direct index serves: an output shows the bracket.
+    std::mt19937 random(5);
+    std::uniform_int_distribution<int> quarters(-60, 60);
+    for (std::size_t size : {2u, 15u, 16u, 17u, 33u, 255u, 256u, 257u, 600u}) {
+        Entries entries;
+        for (std::size_t i = 0; i < size; ++i) {
+            entries.emplace_back(quarters(random) / 4.0, 0);
+        }
+        std::sort(entries.begin(), entries.end());
+        entries.back().first = size % 2 == 1 ? kNaN : entries.back().first;
+        for (std::size_t i = 0; i < size; ++i) {
+            entries[i].second = static_cast<double>(i);
+        }
+        const LUT lut(entries);
+        for (int eighths = -8 * 16 + 1; eighths < 8 * 16; eighths += 2) {
+            const double x = eighths / 8.0;
+            const std::size_t j = FirstNotBelow(entries, x);
+            const auto bracket = static_cast<double>(j);
+            const double value = lut.GetValue(x);
+            if (j == 0 || j == size) {
+                EXPECT_EQ(value, j == 0 ? 0 : bracket - 1) << size << " " << x;
+            } else if (!std::isnan(entries[j].first)) {
+                EXPECT_GT(value, bracket - 1) << size << " " << x;
+                EXPECT_LT(value, bracket) << size << " " << x;
+            }
+        }
+        for (const LUT::Entry& entry : entries) {
+            if (entry.first != std::trunc(entry.first)) {  // no direct index
+                EXPECT_EQ(lut.GetValue(entry.first),
+                          static_cast<double>(FirstNotBelow(entries, entry.first)));
+            }
+        }
+    }
+    // A NaN among numbers stays where it was given; the halving search lands on entry 0 for
+    // 0.5, where a count of the inputs below would land on the NaN.
+    const LUT unordered(Entries{{1, 10}, {kNaN, 20}, {0, 30}});
+    EXPECT_EQ(unordered.GetValue(0.5), 10);
 }
 
 TEST(LUT, SortsOnlyWhenANeighbourPairIsOutOfOrderNaNLast) {

@@ -5,7 +5,7 @@
 
 #include <algorithm>  // std::min
 #include <cstdint>    // std::int64_t, std::uint32_t
-#include <utility>    // std::pair, std::move
+#include <utility>    // std::pair
 #include <vector>
 
 namespace kora::kubo::detail {
@@ -34,7 +34,9 @@ public:
     }
 
 protected:
-    explicit BreakpointTable(std::vector<Entry> entries) : m_entries(std::move(entries)) {}
+    /// Takes `entries`, sorted by input unless no neighbour pair is out of order (NaN inputs
+    /// then last), and lays out their inputs for the search.
+    explicit BreakpointTable(std::vector<Entry> entries);
     // Copies only: a move would leave a table without breakpoints.
     BreakpointTable(const BreakpointTable&) = default;
     BreakpointTable& operator=(const BreakpointTable&) = default;
@@ -55,6 +57,9 @@ protected:
     }
 
     std::vector<Entry> m_entries;
+    /// The inputs again, in blocks of 16 that a search counts through; empty where the
+    /// search halves the entries instead.
+    std::vector<double> m_inputBlocks;
 };
 
 }  // namespace kora::kubo::detail

@@ -47,7 +47,6 @@ LUT::LUT(const std::vector<Entry>& entries) : BreakpointTable(entries) {
             "&)",
             80);
     }
-    detail::SortByInput(m_entries);
 }
 
 LUT::LUT(const unsigned char* values)
@@ -55,7 +54,7 @@ LUT::LUT(const unsigned char* values)
           values, kSourcePath, "__cdecl kora::kubo::LUT::LUT(const unsigned char *)"))) {}
 
 double LUT::GetSearchedValue(double x) const {
-    const detail::Bracket at = detail::Search(m_entries, x);
+    const detail::Bracket at = detail::Search(m_entries, m_inputBlocks, x);
     const Entry& upper = m_entries[at.index];
     if (!at.between) {
         return upper.second;

@@ -78,7 +78,6 @@ PCT::PCT(const std::vector<Entry>& entries) : BreakpointTable(entries) {
             "std::pair<double,struct kora::kubo::RGBTuple<unsigned char> > > > &)",
             80);
     }
-    detail::SortByInput(m_entries);
 }
 
 PCT::PCT(const unsigned char* planes)
@@ -89,7 +88,7 @@ PCT::PCT(const unsigned char* planes)
               .data())) {}
 
 std::uint32_t PCT::GetSearchedColour(double x) const {
-    const detail::Bracket at = detail::Search(m_entries, x);
+    const detail::Bracket at = detail::Search(m_entries, m_inputBlocks, x);
     const Entry& upper = m_entries[at.index];
     if (!at.between) {
         return Pack(upper.second);
