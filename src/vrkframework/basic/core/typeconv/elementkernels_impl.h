@@ -8,6 +8,7 @@
 #include <cstring>  // std::memcpy
 #include <type_traits>
 
+#include "vrkframework/basic/core/kernels/bytestodoubles.h"
 #include "vrkframework/basic/core/typeconv/conversionkernels.h"
 #include "vrkframework/basic/core/typeconv/saturate.h"
 
@@ -28,6 +29,16 @@ void Convert(const void* src, void* dst, std::size_t count) {
     ConvertLoop<A, B, Stride>(static_cast<const A*>(src), static_cast<B*>(dst), count);
 }
 
+#if KUBO_DETAIL_WIDE_BYTE_SHUFFLES
+template <class A>
+void ConvertBytesToDoubles(const void* src, void* dst, std::size_t count) {
+    const auto* bytes = static_cast<const A*>(src);
+    auto* doubles = static_cast<double*>(dst);
+    const std::size_t done = kora::kubo::detail::ConvertByteVectorsToDoubles(bytes, doubles, count);
+    ConvertLoop<A, double, 1>(bytes + done, doubles + done, count - done);
+}
+#endif
+
 template <std::size_t Size>
 using UnsignedOfSize = std::conditional_t<
     Size == 1, std::uint8_t,
@@ -46,8 +57,9 @@ void Copy(const void* src, void* dst, std::size_t count) {
 /// sources into 64-bit integers (negatives to 0) give the same bits for both signs of the
 /// destination and share the unsigned destination's kernel.
 ///
-/// Every variant compiles every pair; a processor family that runs some of them faster
-/// from the variant below takes them from there (processortuning.h).
+/// 8-bit samples into doubles go through whole vectors where the variant spells those out
+/// (bytestodoubles.h). Every variant compiles every pair; a processor family that runs some of them
+/// faster from the variant below takes them from there (processortuning.h).
 template <class A, class B, std::size_t Stride>
 constexpr ConvertKernel SelectConvertKernel() {
     constexpr bool kSameBits =
@@ -61,6 +73,10 @@ constexpr ConvertKernel SelectConvertKernel() {
                          (std::is_unsigned_v<A> ? sizeof(B) > sizeof(A)
                                                 : sizeof(B) == 8 && sizeof(A) < 8)) {
         return &Convert<A, std::make_unsigned_t<B>, Stride>;
+#if KUBO_DETAIL_WIDE_BYTE_SHUFFLES
+    } else if constexpr (sizeof(A) == 1 && std::is_same_v<B, double> && Stride == 1) {
+        return &ConvertBytesToDoubles<A>;
+#endif
     } else {
         return &Convert<A, B, Stride>;
     }
