@@ -124,6 +124,11 @@ void CheckEveryBitCount() {
             std::vector<T> mixed = samples;
             if (count > 300) {
                 mixed[300] = overWide[300];
+                // In a block of its own, bits set only above bit 31, in the last sample of a
+                // word of 1, 2, 4 or 8 samples.
+                if constexpr (sizeof(T) == 8) {
+                    mixed[607] = static_cast<T>(samples[607] | T{1} << 33);
+                }
             }
             const std::vector<unsigned char> stream =
                 kubo_test::ReferencePack(samples.data(), count, bits);

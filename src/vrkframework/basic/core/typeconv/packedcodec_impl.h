@@ -139,10 +139,12 @@ void Unpack(const unsigned char* packed, void* target, std::size_t count, unsign
     }
 }
 
-template <class T>
-std::uint64_t Widen(T sample) {
-    using Wide = std::conditional_t<std::is_signed_v<T>, std::int64_t, std::uint64_t>;
-    return static_cast<std::uint64_t>(static_cast<Wide>(sample));
+/// `sample` sign- or zero-extended to Bits bits, as an unsigned number.
+template <unsigned int Bits = 64, class T>
+auto Widen(T sample) {
+    using Unsigned = std::conditional_t<Bits == 64, std::uint64_t, std::uint32_t>;
+    using Wide = std::conditional_t<std::is_signed_v<T>, std::make_signed_t<Unsigned>, Unsigned>;
+    return static_cast<Unsigned>(static_cast<Wide>(sample));
 }
 
 /// Bits dividing 8: 8 / Bits samples per byte, the first on top. Samples never span two
@@ -223,7 +225,15 @@ public:
         m_fill %= 8;
     }
 
-    /// The same, storing only the completed bytes: near the end of the stream.
+    /// Appends `bits` bits (at most 56, a whole number of bytes) from `word` at a byte
+    /// boundary, where the next append starts on one again: nothing is pending between them,
+    /// so one append's store does not wait for the last. Stores 8 bytes from m_next.
+    void AppendBytes(std::uint64_t word, unsigned int bits) {
+        StoreHighFirst(m_next, word << (64 - bits));
+        m_next += bits / 8;
+    }
+
+    /// The same as `Append`, storing only the completed bytes: near the end of the stream.
     void AppendNearEnd(std::uint64_t word, unsigned int bits) {
         m_pending |= word << (64 - m_fill - bits);
         for (m_fill += bits; m_fill >= 8; m_fill -= 8) {
@@ -245,30 +255,52 @@ private:
     unsigned int m_fill = 0;
 };
 
+/// PerWord samples from `samples` side by side in the low PerWord * bits bits, the first on
+/// top. Each sample must fit in `bits` bits.
+template <unsigned int PerWord, class T>
+std::uint64_t Group(const T* samples, unsigned int bits) {
+    std::uint64_t word = 0;
+    for (unsigned int j = 0; j < PerWord; ++j) {
+        word |= Widen(samples[j]) << (PerWord - 1 - j) * bits;
+    }
+    return word;
+}
+
 /// Any bit count, PerWord samples per append (PerWord * bits at most 56). Blocks whose
 /// samples all fit in `bits` bits (the usual case) go a word at a time while 8 bytes of
-/// stream remain; other samples go one by one with their exact over-wide bits.
+/// stream remain; other samples go one by one with their exact over-wide bits. Where a
+/// word is whole bytes, as 8 samples of up to 7 bits, 4 of an even count or 2 of a multiple
+/// of 4 are, every block starts on a byte boundary (256 samples are whole bytes too) and its
+/// words are stored side by side.
 template <unsigned int PerWord, class T>
 void PackWords(const T* __restrict samples, unsigned char* __restrict packed, std::size_t count,
                unsigned int bits) {
     constexpr std::size_t kBlock = 256;
+    const unsigned int wordBits = PerWord * bits;
     const std::size_t windowed = SamplesWithWholeWindow(count, bits);
     BitWriter writer(packed);
     for (std::size_t done = 0; done < count; done += kBlock) {
         const std::size_t n = count - done < kBlock ? count - done : kBlock;
         const T* block = samples + done;
-        std::uint64_t over = 0;
+        // Set bits above `bits` (fewer than 32) show in 32-bit lanes, sign extension included,
+        // unless the samples are wider.
+        constexpr unsigned int kLaneBits = sizeof(T) <= 4 ? 32 : 64;
+        decltype(Widen<kLaneBits>(T{})) over = 0;
         for (std::size_t i = 0; i < n; ++i) {
-            over |= Widen(block[i]) >> bits;
+            over |= Widen<kLaneBits>(block[i]) >> bits;
         }
+        // Whole words whose first sample has 8 bytes of stream from its byte.
+        const std::size_t windowedHere = done < windowed ? windowed - done : 0;
+        const std::size_t words =
+            over != 0 ? 0 : std::min(n / PerWord, (windowedHere + PerWord - 1) / PerWord);
         std::size_t i = 0;
-        if (over == 0) {
-            for (; i + PerWord <= n && done + i < windowed; i += PerWord) {
-                std::uint64_t word = 0;
-                for (unsigned int j = 0; j < PerWord; ++j) {
-                    word |= Widen(block[i + j]) << (PerWord - 1 - j) * bits;
-                }
-                writer.Append(word, PerWord * bits);
+        if (wordBits % 8 == 0) {
+            for (; i < words * PerWord; i += PerWord) {
+                writer.AppendBytes(Group<PerWord>(block + i, bits), wordBits);
+            }
+        } else {
+            for (; i < words * PerWord; i += PerWord) {
+                writer.Append(Group<PerWord>(block + i, bits), wordBits);
             }
         }
         for (; i < n; ++i) {
