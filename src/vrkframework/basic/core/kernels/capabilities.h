@@ -7,15 +7,16 @@
 
 namespace kora::kubo::detail {
 
-/// The width of the vectors, in bits.
-constexpr unsigned int kVectorBits =
+/// The width of the vectors, in bits. Also a macro, for the code that spells such vectors
+/// out.
 #if defined(__AVX512F__)
-    512;
+#define KUBO_DETAIL_VECTOR_BITS 512
 #elif defined(__AVX2__)
-    256;
+#define KUBO_DETAIL_VECTOR_BITS 256
 #else
-    128;
+#define KUBO_DETAIL_VECTOR_BITS 128
 #endif
+constexpr unsigned int kVectorBits = KUBO_DETAIL_VECTOR_BITS;
 
 /// Conversions between floating lanes and unsigned 32-bit or any 64-bit integer lanes, and
 /// min and max of unsigned and 64-bit lanes: there the plain conversions vectorise.

@@ -8,7 +8,7 @@
 #include <cstring>  // std::memcpy
 #include <type_traits>
 
-#include "vrkframework/basic/core/kernels/bytestodoubles.h"
+#include "vrkframework/basic/core/kernels/bytewidening.h"
 #include "vrkframework/basic/core/typeconv/conversionkernels.h"
 #include "vrkframework/basic/core/typeconv/saturate.h"
 
@@ -30,14 +30,27 @@ void Convert(const void* src, void* dst, std::size_t count) {
 }
 
 #if KUBO_DETAIL_WIDE_BYTE_SHUFFLES
-template <class A>
-void ConvertBytesToDoubles(const void* src, void* dst, std::size_t count) {
+/// 8-bit samples into B: whole vectors widened as the variant spells out (bytewidening.h),
+/// the rest by the loop.
+template <class A, class B>
+void WidenBytes(const void* src, void* dst, std::size_t count) {
     const auto* bytes = static_cast<const A*>(src);
-    auto* doubles = static_cast<double*>(dst);
-    const std::size_t done = kora::kubo::detail::ConvertByteVectorsToDoubles(bytes, doubles, count);
-    ConvertLoop<A, double, 1>(bytes + done, doubles + done, count - done);
+    auto* wide = static_cast<B*>(dst);
+    const std::size_t done = kora::kubo::detail::WidenByteVectors(bytes, wide, count);
+    ConvertLoop<A, B, 1>(bytes + done, wide + done, count - done);
 }
 #endif
+
+/// `Convert`, or `WidenBytes` where the variant has it for the pair.
+template <class A, class B, std::size_t Stride>
+constexpr ConvertKernel ConvertOrWiden() {
+#if KUBO_DETAIL_WIDE_BYTE_SHUFFLES
+    if constexpr (Stride == 1 && kora::kubo::detail::kWidensBytes<A, B>) {
+        return &WidenBytes<A, B>;
+    }
+#endif
+    return &Convert<A, B, Stride>;
+}
 
 template <std::size_t Size>
 using UnsignedOfSize = std::conditional_t<
@@ -57,8 +70,7 @@ void Copy(const void* src, void* dst, std::size_t count) {
 /// sources into 64-bit integers (negatives to 0) give the same bits for both signs of the
 /// destination and share the unsigned destination's kernel.
 ///
-/// 8-bit samples into doubles go through whole vectors where the variant spells those out
-/// (bytestodoubles.h). Every variant compiles every pair; a processor family that runs some of them
+/// Every variant compiles every pair; a processor family that runs some of them
 /// faster from the variant below takes them from there (processortuning.h).
 template <class A, class B, std::size_t Stride>
 constexpr ConvertKernel SelectConvertKernel() {
@@ -72,13 +84,9 @@ constexpr ConvertKernel SelectConvertKernel() {
     } else if constexpr (std::is_integral_v<A> && std::is_integral_v<B> &&
                          (std::is_unsigned_v<A> ? sizeof(B) > sizeof(A)
                                                 : sizeof(B) == 8 && sizeof(A) < 8)) {
-        return &Convert<A, std::make_unsigned_t<B>, Stride>;
-#if KUBO_DETAIL_WIDE_BYTE_SHUFFLES
-    } else if constexpr (sizeof(A) == 1 && std::is_same_v<B, double> && Stride == 1) {
-        return &ConvertBytesToDoubles<A>;
-#endif
+        return ConvertOrWiden<A, std::make_unsigned_t<B>, Stride>();
     } else {
-        return &Convert<A, B, Stride>;
+        return ConvertOrWiden<A, B, Stride>();
     }
 }
 
