@@ -89,8 +89,9 @@ constexpr std::size_t kMaxInputBlocks = 16;
 /// How many of the 16 inputs at `block` are below `x`, two at a time in vector lanes: a
 /// compare gives -1 in a lane whose input is below, which is subtracted. Unlike a halving
 /// step no comparison waits for another, and four running counts keep the sums short, so a
-/// lookup's search is a few cycles deep.
+/// lookup's search is a few cycles deep. Compilers without vector types count one by one.
 inline std::size_t CountBelow(const double* block, double x) {
+#if defined(__GNUC__)
     using Pair = double __attribute__((vector_size(16)));
     using Counts = std::int64_t __attribute__((vector_size(16)));
     constexpr std::size_t kLanes = 2;
@@ -104,6 +105,13 @@ inline std::size_t CountBelow(const double* block, double x) {
     }
     const Counts total = (below[0] + below[1]) + (below[2] + below[3]);
     return static_cast<std::size_t>(total[0] + total[1]);
+#else
+    std::size_t below = 0;
+    for (std::size_t i = 0; i < kBlockInputs; ++i) {
+        below += block[i] < x ? 1 : 0;
+    }
+    return below;
+#endif
 }
 
 /// The inputs of `entries` laid out for `LowerBoundInBlocks`: up to 16 inputs make one block;
