@@ -2,9 +2,11 @@
 // 512-bit vectors also 64-bit integers. The bytes of one vector are widened in one step
 // (into 32-bit lanes for doubles, then converted). The vectorised loop widens a whole vector
 // of bytes through 16- and 32-bit lanes and extracts halves on the way, which keeps the
-// shuffle port busier than the stores: about a fifth slower in the caches (private to the
-// library; compiled only where KUBO_DETAIL_WIDE_BYTE_SHUFFLES is set, with internal linkage,
-// so that the copies of different kernel variants never mix).
+// shuffle port busier than the stores: about a fifth slower in the caches with 256-bit
+// vectors, and with 512-bit ones when the core's other thread competes for that port (as
+// fast when it does not). Private to the library; compiled only where
+// KUBO_DETAIL_WIDE_BYTE_SHUFFLES is set, with internal linkage, so that the copies of
+// different kernel variants never mix.
 #ifndef VRKFRAMEWORK_BASIC_CORE_KERNELS_BYTEWIDENING_H
 #define VRKFRAMEWORK_BASIC_CORE_KERNELS_BYTEWIDENING_H
 

@@ -70,8 +70,8 @@ void Copy(const void* src, void* dst, std::size_t count) {
 /// sources into 64-bit integers (negatives to 0) give the same bits for both signs of the
 /// destination and share the unsigned destination's kernel.
 ///
-/// Every variant compiles every pair; a processor family that runs some of them
-/// faster from the variant below takes them from there (processortuning.h).
+/// Every variant compiles every pair; a processor family that runs some of them faster
+/// from the variant below takes them from there (processortuning.h).
 template <class A, class B, std::size_t Stride>
 constexpr ConvertKernel SelectConvertKernel() {
     constexpr bool kSameBits =
