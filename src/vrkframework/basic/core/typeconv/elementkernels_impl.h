@@ -9,6 +9,7 @@
 #include <type_traits>
 
 #include "vrkframework/basic/core/kernels/bytewidening.h"
+#include "vrkframework/basic/core/kernels/floatingnarrowing.h"
 #include "vrkframework/basic/core/typeconv/conversionkernels.h"
 #include "vrkframework/basic/core/typeconv/saturate.h"
 
@@ -29,24 +30,28 @@ void Convert(const void* src, void* dst, std::size_t count) {
     ConvertLoop<A, B, Stride>(static_cast<const A*>(src), static_cast<B*>(dst), count);
 }
 
-#if KUBO_DETAIL_WIDE_BYTE_SHUFFLES
-/// 8-bit samples into B: whole vectors widened as the variant spells out (bytewidening.h),
-/// the rest by the loop.
-template <class A, class B>
-void WidenBytes(const void* src, void* dst, std::size_t count) {
-    const auto* bytes = static_cast<const A*>(src);
-    auto* wide = static_cast<B*>(dst);
-    const std::size_t done = kora::kubo::detail::WidenByteVectors(bytes, wide, count);
-    ConvertLoop<A, B, 1>(bytes + done, wide + done, count - done);
+/// Whole vectors converted as the variant spells them out (`Vectors` returns how many
+/// samples that was), the rest by the loop.
+template <class A, class B, std::size_t (*Vectors)(const A*, B*, std::size_t)>
+void VectorsThenLoop(const void* src, void* dst, std::size_t count) {
+    const auto* from = static_cast<const A*>(src);
+    auto* to = static_cast<B*>(dst);
+    const std::size_t done = Vectors(from, to, count);
+    ConvertLoop<A, B, 1>(from + done, to + done, count - done);
 }
-#endif
 
-/// `Convert`, or `WidenBytes` where the variant has it for the pair.
+/// `Convert`, or vectors spelled out where the variant has them for the pair: 8-bit samples
+/// widened (bytewidening.h) and floating samples narrowed (floatingnarrowing.h).
 template <class A, class B, std::size_t Stride>
-constexpr ConvertKernel ConvertOrWiden() {
+constexpr ConvertKernel SpelledOutOrConvert() {
 #if KUBO_DETAIL_WIDE_BYTE_SHUFFLES
     if constexpr (Stride == 1 && kora::kubo::detail::kWidensBytes<A, B>) {
-        return &WidenBytes<A, B>;
+        return &VectorsThenLoop<A, B, &kora::kubo::detail::WidenByteVectors<A, B>>;
+    }
+#endif
+#if KUBO_DETAIL_VECTOR_BITS == 512
+    if constexpr (Stride == 1 && kora::kubo::detail::kNarrowsFloating<A, B>) {
+        return &VectorsThenLoop<A, B, &kora::kubo::detail::NarrowFloatingVectors<A, B>>;
     }
 #endif
     return &Convert<A, B, Stride>;
@@ -84,9 +89,9 @@ constexpr ConvertKernel SelectConvertKernel() {
     } else if constexpr (std::is_integral_v<A> && std::is_integral_v<B> &&
                          (std::is_unsigned_v<A> ? sizeof(B) > sizeof(A)
                                                 : sizeof(B) == 8 && sizeof(A) < 8)) {
-        return ConvertOrWiden<A, std::make_unsigned_t<B>, Stride>();
+        return SpelledOutOrConvert<A, std::make_unsigned_t<B>, Stride>();
     } else {
-        return ConvertOrWiden<A, B, Stride>();
+        return SpelledOutOrConvert<A, B, Stride>();
     }
 }
 
