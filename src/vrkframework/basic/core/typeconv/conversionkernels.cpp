@@ -51,19 +51,42 @@ void FillGaps(KernelSet& kernels, const KernelSet& before) {
     fill(kernels.pack, before.pack);
 }
 
+std::size_t SamplesBeforeLine(const void* samples, std::size_t sampleBytes, std::size_t count,
+                              std::size_t streamBits) {
+    const std::size_t toLine =
+        (kLineBytes - reinterpret_cast<std::uintptr_t>(samples) % kLineBytes) % kLineBytes;
+    const std::size_t head = toLine / sampleBytes;
+    return toLine % sampleBytes == 0 && head * streamBits % 8 == 0 ? std::min(head, count) : 0;
+}
+
 void RunPromote(const KernelSet& kernels, SampleLayout layout, std::size_t from, std::size_t to,
                 const void* src, void* dst, std::size_t count) {
-    const bool copyOut = count * SampleBytes(layout, to, Side::kOutput) >= kCopyOutBytes;
-    const ConvertKernel convert = kernels.convert[from][to];
+    const std::size_t inSize = SampleBytes(layout, from, Side::kInput);
+    const std::size_t outSize = SampleBytes(layout, to, Side::kOutput);
+    const bool copyOut = count * outSize >= kCopyOutBytes;
     if (copyOut || layout == SampleLayout::kRealToComplex) {
         RunPromoteInBlocks(kernels, layout, from, to, src, dst, count, copyOut);
-    } else if (layout == SampleLayout::kReal) {
-        convert(src, dst, count);
-    } else if (layout == SampleLayout::kComplex) {
-        convert(src, dst, 2 * count);
-    } else {
-        kernels.convertRealParts[from][to](src, dst, count);
+        return;
     }
+    const auto run = [&](std::size_t first, std::size_t n) {
+        const unsigned char* in = static_cast<const unsigned char*>(src) + first * inSize;
+        unsigned char* out = static_cast<unsigned char*>(dst) + first * outSize;
+        if (layout == SampleLayout::kReal) {
+            kernels.convert[from][to](in, out, n);
+        } else if (layout == SampleLayout::kComplex) {
+            kernels.convert[from][to](in, out, 2 * n);
+        } else {
+            kernels.convertRealParts[from][to](in, out, n);
+        }
+    };
+    // The wider side takes the more vector accesses: a widening's stores, a narrowing's
+    // loads.
+    const std::size_t head = outSize >= inSize ? SamplesBeforeLine(dst, outSize, count)
+                                               : SamplesBeforeLine(src, inSize, count);
+    if (head != 0) {
+        run(0, head);
+    }
+    run(head, count - head);
 }
 
 void RunPromoteInBlocks(const KernelSet& kernels, SampleLayout layout, std::size_t from,
@@ -76,9 +99,8 @@ void RunPromoteInBlocks(const KernelSet& kernels, SampleLayout layout, std::size
     alignas(64) unsigned char values[kBlockBytes / 2];  // real values before interleaving
     // The first block ends where the destination reaches a cache line, so that the blocks
     // after it are copied out in whole lines.
-    const std::size_t toLine =
-        (kLineBytes - reinterpret_cast<std::uintptr_t>(dst) % kLineBytes) % kLineBytes;
-    std::size_t n = toLine != 0 && toLine % outSize == 0 ? toLine / outSize : blockCount;
+    std::size_t n = SamplesBeforeLine(dst, outSize, blockCount);
+    n = n != 0 ? n : blockCount;
     for (std::size_t done = 0; done < count; done += n, n = blockCount) {
         n = std::min(n, count - done);
         const unsigned char* in = static_cast<const unsigned char*>(src) + done * inSize;

@@ -49,8 +49,16 @@ const KernelSet& ActiveKernels();
 /// the reading of every destination line before it is overwritten.
 constexpr std::size_t kCopyOutBytes = std::size_t{4} << 20;
 
+/// How many of `count` samples of `sampleBytes` bytes lie before `samples` reaches a cache
+/// line, where that many end on a byte of a packed stream of `streamBits` bits a sample; 0
+/// where no such count gets there. Drivers run those samples in a call of their own, so
+/// that no vector access of the call for the rest spans two lines.
+std::size_t SamplesBeforeLine(const void* samples, std::size_t sampleBytes, std::size_t count,
+                              std::size_t streamBits = 8);
+
 /// Runs the conversion of `count` samples of a family's layout: through RunPromoteInBlocks
-/// with `copyOut` set when the output takes at least kCopyOutBytes.
+/// with `copyOut` set when the output takes at least kCopyOutBytes, else in place, the
+/// samples before the wider side's first cache line apart.
 void RunPromote(const KernelSet& kernels, SampleLayout layout, std::size_t from, std::size_t to,
                 const void* src, void* dst, std::size_t count);
 

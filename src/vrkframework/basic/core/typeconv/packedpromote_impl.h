@@ -19,11 +19,24 @@ void PackedOperations<N, T, S>::Promote(const void* src, void* dst, unsigned int
         }
     } else if (detail::IsPackedCountPositive(count)) {
         detail::CheckBuffers(src, dst, count);
+        // The samples before the samples' first cache line go in a call of their own.
+        const detail::KernelSet& kernels = detail::ActiveKernels();
         if constexpr (S == 0) {
-            detail::ActiveKernels().unpack[kIndex](static_cast<const unsigned char*>(src), dst,
-                                                   count, N);
+            const auto* packed = static_cast<const unsigned char*>(src);
+            auto* samples = static_cast<T*>(dst);
+            const std::size_t head = detail::SamplesBeforeLine(samples, sizeof(T), count, N);
+            if (head != 0) {
+                kernels.unpack[kIndex](packed, samples, head, N);
+            }
+            kernels.unpack[kIndex](packed + head * N / 8, samples + head, count - head, N);
         } else {
-            detail::ActiveKernels().pack[kIndex](src, static_cast<unsigned char*>(dst), count, N);
+            const auto* samples = static_cast<const T*>(src);
+            auto* packed = static_cast<unsigned char*>(dst);
+            const std::size_t head = detail::SamplesBeforeLine(samples, sizeof(T), count, N);
+            if (head != 0) {
+                kernels.pack[kIndex](samples, packed, head, N);
+            }
+            kernels.pack[kIndex](samples + head, packed + head * N / 8, count - head, N);
         }
     }
 }
