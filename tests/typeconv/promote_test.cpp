@@ -288,7 +288,7 @@ const bool kCopyOutRegistered = [] {
                 for (std::size_t bytes :
                      {0u, 1u, 15u, 16u, 17u, 63u, 64u, 65u, 127u, 128u, 129u, 300u, 640u}) {
                     std::vector<unsigned char> out(offset + bytes + kGuard, kSentinel);
-                    copyOut(block.data(), out.data() + offset, bytes);
+                    copyOut(block.data(), out.data() + offset, bytes, true);
                     for (std::size_t i = 0; i < out.size(); ++i) {
                         const bool copied = i >= offset && i < offset + bytes;
                         ASSERT_EQ(out[i], copied ? block[i - offset] : kSentinel)

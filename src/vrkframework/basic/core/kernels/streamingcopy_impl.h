@@ -45,9 +45,10 @@ inline void StoreStreamed(unsigned char* to, StreamedVector v) {
 /// plain stores is first read into the cache (a line is fetched before it is overwritten),
 /// which for outputs far larger than the caches costs as much memory traffic as the writing
 /// itself; stores that bypass the caches write whole lines without that read. The parts of
-/// `dst` before its first and after its last aligned vector are copied plainly; the stores
-/// are ordered before any later store of the caller's thread.
-void CopyBypassingCaches(const void* block, void* dst, std::size_t bytes) {
+/// `dst` before its first and after its last aligned vector are copied plainly. With
+/// `fence` set, the streamed stores of the thread so far are then ordered before any of its
+/// later stores.
+void CopyBypassingCaches(const void* block, void* dst, std::size_t bytes, bool fence) {
     const auto* from = static_cast<const unsigned char*>(block);
     auto* to = static_cast<unsigned char*>(dst);
 #if KUBO_DETAIL_STREAMING_STORE_BYTES != 0
@@ -60,11 +61,15 @@ void CopyBypassingCaches(const void* block, void* dst, std::size_t bytes) {
         for (std::size_t i = head; i < head + body; i += kWidth) {
             StoreStreamed(to + i, LoadStreamed(from + i));
         }
-        _mm_sfence();
         from += head + body;
         to += head + body;
         bytes -= head + body;
     }
+    if (fence) {
+        _mm_sfence();
+    }
+#else
+    static_cast<void>(fence);
 #endif
     if (bytes != 0) {
         std::memcpy(to, from, bytes);

@@ -20,8 +20,11 @@ using UnpackKernel = void (*)(const unsigned char* packed, void* samples, std::s
 /// `count` whole-byte samples into a packed stream of `bits`-bit samples.
 using PackKernel = void (*)(const void* samples, unsigned char* packed, std::size_t count,
                             unsigned int bits);
-/// `bytes` bytes from a block in the first-level cache to memory, past the caches.
-using CopyOutKernel = void (*)(const void* block, void* dst, std::size_t bytes);
+/// `bytes` bytes from a block in the first-level cache to memory, past the caches; with
+/// `fence` set, every such store of the thread so far is then ordered before its later
+/// stores. A driver sets it on its last block only: a fence drains the write-combining
+/// buffers, which between blocks would stall the stores.
+using CopyOutKernel = void (*)(const void* block, void* dst, std::size_t bytes, bool fence);
 
 /// Every conversion kernel of one kernel variant; a null entry is taken from the variant
 /// before it.
