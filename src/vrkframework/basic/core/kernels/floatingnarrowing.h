@@ -1,12 +1,18 @@
-// Floating samples rounded into 8- and 16-bit integers, one 512-bit vector at a time: the
-// clamp happens in the floating lanes, where minimum and maximum let NaN through in the
-// chosen operand order, and one truncating conversion into integer lanes of the same width
-// and one truncating narrowing follow. NaN converts to the lowest integer of the lane,
-// whose low bytes are 0, as the rules have it. The vectorised loop cannot clamp in the
-// floating lanes (a C++ conversion of NaN is undefined), so it clamps the converted 64-bit
-// lanes with compares and blends and narrows them through permutes, several shuffles per
-// vector more. Private to the library; compiled only with 512-bit vectors, with internal
-// linkage, so that the copies of different kernel variants never mix.
+// Floating samples rounded into 8- and 16-bit integers with 512-bit vectors. The half is
+// added in the source precision, then:
+// - doubles are clamped in their lanes, where minimum and maximum let NaN through in the
+//   chosen operand order, truncated into 64-bit lanes (NaN into the lowest integer, whose
+//   low bytes are 0, as the rules have it) and narrowed by keeping the low bytes;
+// - floats are clamped from above only, truncated into 32-bit lanes and narrowed by
+//   saturating packs, which clamp from below, two or four vectors at a time: a pack takes
+//   one shuffle for two vectors where a narrowing takes two for one. NaN gives 0 through
+//   a mask of the ordered lanes for signed results, and for unsigned ones through the
+//   saturation of the lowest integer it truncates to.
+// The vectorised loop cannot clamp before converting (a C++ conversion of NaN is undefined),
+// so it clamps the converted 64-bit lanes with compares and blends and narrows them through
+// permutes, several shuffles per vector more. Private to the library; compiled only with
+// 512-bit vectors, with internal linkage, so that the copies of different kernel variants
+// never mix.
 #ifndef VRKFRAMEWORK_BASIC_CORE_KERNELS_FLOATINGNARROWING_H
 #define VRKFRAMEWORK_BASIC_CORE_KERNELS_FLOATINGNARROWING_H
 
@@ -28,56 +34,89 @@ template <class Floating, class Narrow>
 constexpr bool kNarrowsFloating = std::is_floating_point_v<Floating>&& std::is_integral_v<Narrow> &&
                                   sizeof(Narrow) <= 2;
 
-/// The operations `NarrowFloatingVectors` needs on one vector of floats or doubles.
-template <class Floating>
-struct FloatingVector;
+// Every lane, written as a mask: the unmasked forms trip GCC 12's uninitialised-use
+// warning, and the compiler drops a full mask.
+constexpr __mmask8 kEightLanes = 0xFF;
+constexpr __mmask16 kSixteenLanes = 0xFFFF;
 
-template <>
-struct FloatingVector<double> {
-    using Type = __m512d;
-    /// Every lane, written as a mask: the unmasked forms trip GCC 12's uninitialised-use
-    /// warning, and the compiler drops a full mask.
-    static constexpr __mmask8 kAllLanes = 0xFF;
-    static Type Load(const double* from) { return _mm512_loadu_pd(from); }
-    static Type Splat(double value) { return _mm512_set1_pd(value); }
-    static Type Add(Type a, Type b) { return _mm512_add_pd(a, b); }
-    /// The second operand where either is NaN, as for `Max`.
-    static Type Min(Type a, Type b) { return _mm512_maskz_min_pd(kAllLanes, a, b); }
-    static Type Max(Type a, Type b) { return _mm512_maskz_max_pd(kAllLanes, a, b); }
-    /// |magnitude| with the sign of `sign`, for a non-negative magnitude.
-    static Type WithSignOf(Type magnitude, Type sign) {
-        return _mm512_or_pd(magnitude, _mm512_and_pd(sign, Splat(-0.0)));
-    }
-    static __m512i Truncate(Type value) { return _mm512_maskz_cvttpd_epi64(kAllLanes, value); }
-};
+/// x + 0.5, or x plus a half with the sign of x.
+template <bool kAwayFromZero>
+__m512d PlusHalf(__m512d x) {
+    const __m512d half = _mm512_set1_pd(0.5);
+    return _mm512_add_pd(
+        x, kAwayFromZero ? _mm512_or_pd(half, _mm512_and_pd(x, _mm512_set1_pd(-0.0))) : half);
+}
 
-template <>
-struct FloatingVector<float> {
-    using Type = __m512;
-    static constexpr __mmask16 kAllLanes = 0xFFFF;
-    static Type Load(const float* from) { return _mm512_loadu_ps(from); }
-    static Type Splat(float value) { return _mm512_set1_ps(value); }
-    static Type Add(Type a, Type b) { return _mm512_add_ps(a, b); }
-    static Type Min(Type a, Type b) { return _mm512_maskz_min_ps(kAllLanes, a, b); }
-    static Type Max(Type a, Type b) { return _mm512_maskz_max_ps(kAllLanes, a, b); }
-    static Type WithSignOf(Type magnitude, Type sign) {
-        return _mm512_or_ps(magnitude, _mm512_and_ps(sign, Splat(-0.0f)));
-    }
-    static __m512i Truncate(Type value) { return _mm512_maskz_cvttps_epi32(kAllLanes, value); }
-};
+template <bool kAwayFromZero>
+__m512 PlusHalf(__m512 x) {
+    const __m512 half = _mm512_set1_ps(0.5f);
+    return _mm512_add_ps(
+        x, kAwayFromZero ? _mm512_or_ps(half, _mm512_and_ps(x, _mm512_set1_ps(-0.0f))) : half);
+}
 
-/// Keeps the low `NarrowBytes` bytes of each `LaneBytes`-byte lane, packed together.
-template <std::size_t LaneBytes, std::size_t NarrowBytes>
-auto KeepLowBytes(__m512i lanes) {
-    if constexpr (LaneBytes == 8 && NarrowBytes == 1) {
-        return _mm512_maskz_cvtepi64_epi8(__mmask8{0xFF}, lanes);
-    } else if constexpr (LaneBytes == 8) {
-        return _mm512_maskz_cvtepi64_epi16(__mmask8{0xFF}, lanes);
-    } else if constexpr (NarrowBytes == 1) {
-        return _mm512_maskz_cvtepi32_epi8(__mmask16{0xFFFF}, lanes);
+/// Rounds 8 doubles into `out`.
+template <class Narrow>
+void NarrowEightDoubles(const double* in, Narrow* out) {
+    constexpr bool kSigned = std::is_signed_v<Narrow>;
+    const __m512d high = _mm512_set1_pd(std::numeric_limits<Narrow>::max());
+    const __m512d low = _mm512_set1_pd(std::numeric_limits<Narrow>::lowest());
+    const __m512d y = PlusHalf<kSigned>(_mm512_loadu_pd(in));
+    // Where either operand is NaN, minimum and maximum return the second.
+    const __m512d clamped =
+        kSigned ? _mm512_maskz_max_pd(kEightLanes, low, _mm512_maskz_min_pd(kEightLanes, high, y))
+                : _mm512_maskz_min_pd(kEightLanes, high, _mm512_maskz_max_pd(kEightLanes, y, low));
+    const __m512i lanes = _mm512_maskz_cvttpd_epi64(kEightLanes, clamped);
+    if constexpr (sizeof(Narrow) == 1) {
+        const __m128i narrow = _mm512_maskz_cvtepi64_epi8(kEightLanes, lanes);
+        std::memcpy(out, &narrow, 8);
     } else {
-        return _mm512_maskz_cvtepi32_epi16(__mmask16{0xFFFF}, lanes);
+        _mm_storeu_si128(reinterpret_cast<__m128i*>(out),
+                         _mm512_maskz_cvtepi64_epi16(kEightLanes, lanes));
     }
+}
+
+/// 16 floats rounded into 32-bit lanes for the packs into `Narrow`.
+template <class Narrow>
+__m512i TruncateSixteenFloats(const float* in) {
+    const __m512 y = PlusHalf<std::is_signed_v<Narrow>>(_mm512_loadu_ps(in));
+    const __m512 high = _mm512_set1_ps(std::numeric_limits<Narrow>::max());
+    const __m512 clamped = _mm512_maskz_min_ps(kSixteenLanes, high, y);  // NaN stays NaN
+    if constexpr (std::is_signed_v<Narrow>) {
+        return _mm512_maskz_cvttps_epi32(_mm512_cmp_ps_mask(y, y, _CMP_ORD_Q), clamped);
+    } else {
+        return _mm512_maskz_cvttps_epi32(kSixteenLanes, clamped);
+    }
+}
+
+template <class Narrow>
+__m512i PackIntoWords(__m512i a, __m512i b) {
+    return std::is_signed_v<Narrow> ? _mm512_packs_epi32(a, b) : _mm512_packus_epi32(a, b);
+}
+
+/// Rounds 64 bytes' worth of floats into `out`. The packs work within 128-bit lanes, so
+/// the pieces of the operands come out interleaved and one permute puts them in order.
+template <class Narrow>
+void NarrowFloatsIntoALine(const float* in, Narrow* out) {
+    __m512i line;
+    if constexpr (sizeof(Narrow) == 2) {
+        // Pieces of 4 words: a0 b0 a1 b1 a2 b2 a3 b3.
+        const __m512i words = PackIntoWords<Narrow>(TruncateSixteenFloats<Narrow>(in),
+                                                    TruncateSixteenFloats<Narrow>(in + 16));
+        line = _mm512_maskz_permutexvar_epi64(kEightLanes, _mm512_set_epi64(7, 5, 3, 1, 6, 4, 2, 0),
+                                              words);
+    } else {
+        // Pieces of 4 bytes: a0 b0 c0 d0 a1 b1 c1 d1 ...
+        const __m512i first = PackIntoWords<Narrow>(TruncateSixteenFloats<Narrow>(in),
+                                                    TruncateSixteenFloats<Narrow>(in + 16));
+        const __m512i second = PackIntoWords<Narrow>(TruncateSixteenFloats<Narrow>(in + 32),
+                                                     TruncateSixteenFloats<Narrow>(in + 48));
+        const __m512i bytes = std::is_signed_v<Narrow> ? _mm512_packs_epi16(first, second)
+                                                       : _mm512_packus_epi16(first, second);
+        line = _mm512_maskz_permutexvar_epi32(
+            kSixteenLanes, _mm512_set_epi32(15, 11, 7, 3, 14, 10, 6, 2, 13, 9, 5, 1, 12, 8, 4, 0),
+            bytes);
+    }
+    _mm512_storeu_si512(out, line);
 }
 
 /// Converts the whole vectors' worth at the start of `count` samples as the element loop
@@ -87,25 +126,15 @@ auto KeepLowBytes(__m512i lanes) {
 template <class Floating, class Narrow>
 std::size_t NarrowFloatingVectors(const Floating* in, Narrow* out, std::size_t count) {
     static_assert(kNarrowsFloating<Floating, Narrow>);
-    using Vector = FloatingVector<Floating>;
-    constexpr std::size_t kLanes = 64 / sizeof(Floating);
-    const typename Vector::Type half = Vector::Splat(Floating(0.5));
-    const typename Vector::Type high = Vector::Splat(std::numeric_limits<Narrow>::max());
-    const typename Vector::Type low = Vector::Splat(std::numeric_limits<Narrow>::lowest());
+    constexpr bool kDouble = sizeof(Floating) == 8;
+    constexpr std::size_t kStep = kDouble ? 8 : 64 / sizeof(Narrow);
     std::size_t i = 0;
-    for (; i + kLanes <= count; i += kLanes) {
-        const typename Vector::Type x = Vector::Load(in + i);
-        typename Vector::Type clamped;
-        if constexpr (std::is_signed_v<Narrow>) {
-            const typename Vector::Type y = Vector::Add(x, Vector::WithSignOf(half, x));
-            clamped = Vector::Max(low, Vector::Min(high, y));  // NaN stays NaN
+    for (; i + kStep <= count; i += kStep) {
+        if constexpr (kDouble) {
+            NarrowEightDoubles(in + i, out + i);
         } else {
-            const typename Vector::Type y = Vector::Add(x, half);
-            clamped = Vector::Min(high, Vector::Max(y, low));  // NaN gives 0
+            NarrowFloatsIntoALine(in + i, out + i);
         }
-        const auto narrow =
-            KeepLowBytes<sizeof(Floating), sizeof(Narrow)>(Vector::Truncate(clamped));
-        std::memcpy(out + i, &narrow, kLanes * sizeof(Narrow));
     }
     return i;
 }
