@@ -1,24 +1,25 @@
-// Floating samples rounded into 8- and 16-bit integers with 512-bit vectors. The half is
+// Floating samples rounded into 8- and 16-bit integers a vector at a time. The half is
 // added in the source precision, then:
-// - doubles are clamped in their lanes, where minimum and maximum let NaN through in the
-//   chosen operand order, truncated into 64-bit lanes (NaN into the lowest integer, whose
-//   low bytes are 0, as the rules have it) and narrowed by keeping the low bytes;
-// - floats are clamped from above only, truncated into 32-bit lanes and narrowed by
-//   saturating packs, which clamp from below, two or four vectors at a time: a pack takes
-//   one shuffle for two vectors where a narrowing takes two for one. NaN gives 0 through
-//   a mask of the ordered lanes for signed results, and for unsigned ones through the
-//   saturation of the lowest integer it truncates to.
+// - with 512-bit vectors, doubles are clamped in their lanes, where minimum and maximum let
+//   NaN through in the chosen operand order, truncated into 64-bit lanes (NaN into the
+//   lowest integer, whose low bytes are 0, as the rules have it) and narrowed by keeping
+//   the low bytes;
+// - floats, and doubles with 256-bit vectors, are clamped from above only, truncated into
+//   32-bit lanes and narrowed by saturating packs, which clamp from below, two or four
+//   vectors at a time: a pack takes one shuffle for two vectors where a narrowing takes two
+//   for one. NaN gives 0 through a mask of the ordered lanes for signed results, and for
+//   unsigned ones through the saturation of the lowest integer it truncates to.
 // The vectorised loop cannot clamp before converting (a C++ conversion of NaN is undefined),
-// so it clamps the converted 64-bit lanes with compares and blends and narrows them through
-// permutes, several shuffles per vector more. Private to the library; compiled only with
-// 512-bit vectors, with internal linkage, so that the copies of different kernel variants
-// never mix.
+// so it clamps the converted lanes with compares and blends (two operations each without
+// mask registers) and narrows them through permutes. Private to the library; compiled only
+// with 256- or 512-bit vectors, with internal linkage, so that the copies of different
+// kernel variants never mix.
 #ifndef VRKFRAMEWORK_BASIC_CORE_KERNELS_FLOATINGNARROWING_H
 #define VRKFRAMEWORK_BASIC_CORE_KERNELS_FLOATINGNARROWING_H
 
 #include "vrkframework/basic/core/kernels/capabilities.h"
 
-#if KUBO_DETAIL_VECTOR_BITS == 512
+#if KUBO_DETAIL_VECTOR_BITS >= 256
 #include <immintrin.h>
 
 #include <cstddef>  // std::size_t
@@ -34,6 +35,7 @@ template <class Floating, class Narrow>
 constexpr bool kNarrowsFloating = std::is_floating_point_v<Floating>&& std::is_integral_v<Narrow> &&
                                   sizeof(Narrow) <= 2;
 
+#if KUBO_DETAIL_VECTOR_BITS == 512
 // Every lane, written as a mask: the unmasked forms trip GCC 12's uninitialised-use
 // warning, and the compiler drops a full mask.
 constexpr __mmask8 kEightLanes = 0xFF;
@@ -119,6 +121,85 @@ void NarrowFloatsIntoALine(const float* in, Narrow* out) {
     _mm512_storeu_si512(out, line);
 }
 
+#else
+/// x + 0.5, or x plus a half with the sign of x.
+template <bool kAwayFromZero>
+__m256d PlusHalf(__m256d x) {
+    const __m256d half = _mm256_set1_pd(0.5);
+    return _mm256_add_pd(
+        x, kAwayFromZero ? _mm256_or_pd(half, _mm256_and_pd(x, _mm256_set1_pd(-0.0))) : half);
+}
+
+template <bool kAwayFromZero>
+__m256 PlusHalf(__m256 x) {
+    const __m256 half = _mm256_set1_ps(0.5f);
+    return _mm256_add_ps(
+        x, kAwayFromZero ? _mm256_or_ps(half, _mm256_and_ps(x, _mm256_set1_ps(-0.0f))) : half);
+}
+
+/// y clamped from above (NaN stays NaN); for signed results NaN then gives +0.
+template <class Narrow>
+__m256d ClampForPacking(__m256d y, __m256d high) {
+    const __m256d clamped = _mm256_min_pd(high, y);
+    return std::is_signed_v<Narrow> ? _mm256_and_pd(clamped, _mm256_cmp_pd(y, y, _CMP_ORD_Q))
+                                    : clamped;
+}
+
+template <class Narrow>
+__m256 ClampForPacking(__m256 y, __m256 high) {
+    const __m256 clamped = _mm256_min_ps(high, y);
+    return std::is_signed_v<Narrow> ? _mm256_and_ps(clamped, _mm256_cmp_ps(y, y, _CMP_ORD_Q))
+                                    : clamped;
+}
+
+/// 8 samples rounded into 32-bit lanes for the packs into `Narrow`.
+template <class Narrow>
+__m256i EightForPacking(const float* in) {
+    const __m256 y = PlusHalf<std::is_signed_v<Narrow>>(_mm256_loadu_ps(in));
+    const __m256 high = _mm256_set1_ps(std::numeric_limits<Narrow>::max());
+    return _mm256_cvttps_epi32(ClampForPacking<Narrow>(y, high));
+}
+
+template <class Narrow>
+__m256i EightForPacking(const double* in) {
+    const __m256d high = _mm256_set1_pd(std::numeric_limits<Narrow>::max());
+    const auto four = [&](const double* at) {
+        const __m256d y = PlusHalf<std::is_signed_v<Narrow>>(_mm256_loadu_pd(at));
+        return _mm256_cvttpd_epi32(ClampForPacking<Narrow>(y, high));
+    };
+    return _mm256_set_m128i(four(in + 4), four(in));
+}
+
+template <class Narrow>
+__m256i PackIntoWords(__m256i a, __m256i b) {
+    return std::is_signed_v<Narrow> ? _mm256_packs_epi32(a, b) : _mm256_packus_epi32(a, b);
+}
+
+/// Rounds 32 bytes' worth of samples into `out`. The packs work within 128-bit lanes, so
+/// the pieces of the operands come out interleaved and one permute puts them in order.
+template <class Narrow, class Floating>
+void NarrowIntoHalfALine(const Floating* in, Narrow* out) {
+    __m256i half;
+    if constexpr (sizeof(Narrow) == 2) {
+        // Pieces of 4 words: a0 b0 a1 b1.
+        half = _mm256_permute4x64_epi64(
+            PackIntoWords<Narrow>(EightForPacking<Narrow>(in), EightForPacking<Narrow>(in + 8)),
+            0xD8);
+    } else {
+        // Pieces of 4 bytes: a0 b0 c0 d0 a1 b1 c1 d1.
+        const __m256i first =
+            PackIntoWords<Narrow>(EightForPacking<Narrow>(in), EightForPacking<Narrow>(in + 8));
+        const __m256i second = PackIntoWords<Narrow>(EightForPacking<Narrow>(in + 16),
+                                                     EightForPacking<Narrow>(in + 24));
+        const __m256i bytes = std::is_signed_v<Narrow> ? _mm256_packs_epi16(first, second)
+                                                       : _mm256_packus_epi16(first, second);
+        half = _mm256_permutevar8x32_epi32(bytes, _mm256_set_epi32(7, 3, 6, 2, 5, 1, 4, 0));
+    }
+    _mm256_storeu_si256(reinterpret_cast<__m256i*>(out), half);
+}
+
+#endif
+
 /// Converts the whole vectors' worth at the start of `count` samples as the element loop
 /// would: half away from zero into signed integers (the half added in the source
 /// precision), plus a half and truncated into unsigned ones, saturated at both ends, NaN
@@ -126,15 +207,23 @@ void NarrowFloatsIntoALine(const float* in, Narrow* out) {
 template <class Floating, class Narrow>
 std::size_t NarrowFloatingVectors(const Floating* in, Narrow* out, std::size_t count) {
     static_assert(kNarrowsFloating<Floating, Narrow>);
+#if KUBO_DETAIL_VECTOR_BITS == 512
     constexpr bool kDouble = sizeof(Floating) == 8;
     constexpr std::size_t kStep = kDouble ? 8 : 64 / sizeof(Narrow);
+#else
+    constexpr std::size_t kStep = 32 / sizeof(Narrow);
+#endif
     std::size_t i = 0;
     for (; i + kStep <= count; i += kStep) {
+#if KUBO_DETAIL_VECTOR_BITS == 512
         if constexpr (kDouble) {
             NarrowEightDoubles(in + i, out + i);
         } else {
             NarrowFloatsIntoALine(in + i, out + i);
         }
+#else
+        NarrowIntoHalfALine(in + i, out + i);
+#endif
     }
     return i;
 }
@@ -142,6 +231,6 @@ std::size_t NarrowFloatingVectors(const Floating* in, Narrow* out, std::size_t c
 }  // namespace
 }  // namespace kora::kubo::detail
 
-#endif  // KUBO_DETAIL_VECTOR_BITS == 512
+#endif  // KUBO_DETAIL_VECTOR_BITS >= 256
 
 #endif  // VRKFRAMEWORK_BASIC_CORE_KERNELS_FLOATINGNARROWING_H

@@ -49,7 +49,7 @@ constexpr ConvertKernel SpelledOutOrConvert() {
         return &VectorsThenLoop<A, B, &kora::kubo::detail::WidenByteVectors<A, B>>;
     }
 #endif
-#if KUBO_DETAIL_VECTOR_BITS == 512
+#if KUBO_DETAIL_VECTOR_BITS >= 256
     if constexpr (Stride == 1 && kora::kubo::detail::kNarrowsFloating<A, B>) {
         return &VectorsThenLoop<A, B, &kora::kubo::detail::NarrowFloatingVectors<A, B>>;
     }
