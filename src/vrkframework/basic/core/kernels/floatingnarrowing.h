@@ -18,6 +18,7 @@
 #define VRKFRAMEWORK_BASIC_CORE_KERNELS_FLOATINGNARROWING_H
 
 #include "vrkframework/basic/core/kernels/capabilities.h"
+#include "vrkframework/basic/core/kernels/plushalf.h"
 
 #if KUBO_DETAIL_VECTOR_BITS >= 256
 #include <immintrin.h>
@@ -40,21 +41,6 @@ constexpr bool kNarrowsFloating = std::is_floating_point_v<Floating>&& std::is_i
 // warning, and the compiler drops a full mask.
 constexpr __mmask8 kEightLanes = 0xFF;
 constexpr __mmask16 kSixteenLanes = 0xFFFF;
-
-/// x + 0.5, or x plus a half with the sign of x.
-template <bool kAwayFromZero>
-__m512d PlusHalf(__m512d x) {
-    const __m512d half = _mm512_set1_pd(0.5);
-    return _mm512_add_pd(
-        x, kAwayFromZero ? _mm512_or_pd(half, _mm512_and_pd(x, _mm512_set1_pd(-0.0))) : half);
-}
-
-template <bool kAwayFromZero>
-__m512 PlusHalf(__m512 x) {
-    const __m512 half = _mm512_set1_ps(0.5f);
-    return _mm512_add_ps(
-        x, kAwayFromZero ? _mm512_or_ps(half, _mm512_and_ps(x, _mm512_set1_ps(-0.0f))) : half);
-}
 
 /// Rounds 8 doubles into `out`.
 template <class Narrow>
@@ -122,21 +108,6 @@ void NarrowFloatsIntoALine(const float* in, Narrow* out) {
 }
 
 #else
-/// x + 0.5, or x plus a half with the sign of x.
-template <bool kAwayFromZero>
-__m256d PlusHalf(__m256d x) {
-    const __m256d half = _mm256_set1_pd(0.5);
-    return _mm256_add_pd(
-        x, kAwayFromZero ? _mm256_or_pd(half, _mm256_and_pd(x, _mm256_set1_pd(-0.0))) : half);
-}
-
-template <bool kAwayFromZero>
-__m256 PlusHalf(__m256 x) {
-    const __m256 half = _mm256_set1_ps(0.5f);
-    return _mm256_add_ps(
-        x, kAwayFromZero ? _mm256_or_ps(half, _mm256_and_ps(x, _mm256_set1_ps(-0.0f))) : half);
-}
-
 /// y clamped from above (NaN stays NaN); for signed results NaN then gives +0.
 template <class Narrow>
 __m256d ClampForPacking(__m256d y, __m256d high) {

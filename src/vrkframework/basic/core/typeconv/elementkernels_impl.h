@@ -10,6 +10,7 @@
 
 #include "vrkframework/basic/core/kernels/bytewidening.h"
 #include "vrkframework/basic/core/kernels/floatingnarrowing.h"
+#include "vrkframework/basic/core/kernels/floatingtowideintegers.h"
 #include "vrkframework/basic/core/typeconv/conversionkernels.h"
 #include "vrkframework/basic/core/typeconv/saturate.h"
 
@@ -41,7 +42,8 @@ void VectorsThenLoop(const void* src, void* dst, std::size_t count) {
 }
 
 /// `Convert`, or vectors spelled out where the variant has them for the pair: 8-bit samples
-/// widened (bytewidening.h) and floating samples narrowed (floatingnarrowing.h).
+/// widened (bytewidening.h), floating samples narrowed (floatingnarrowing.h) and, with
+/// 256-bit vectors, converted into 32- and 64-bit integers (floatingtowideintegers.h).
 template <class A, class B, std::size_t Stride>
 constexpr ConvertKernel SpelledOutOrConvert() {
 #if KUBO_DETAIL_WIDE_BYTE_SHUFFLES
@@ -52,6 +54,11 @@ constexpr ConvertKernel SpelledOutOrConvert() {
 #if KUBO_DETAIL_VECTOR_BITS >= 256
     if constexpr (Stride == 1 && kora::kubo::detail::kNarrowsFloating<A, B>) {
         return &VectorsThenLoop<A, B, &kora::kubo::detail::NarrowFloatingVectors<A, B>>;
+    }
+#endif
+#if KUBO_DETAIL_VECTOR_BITS == 256
+    if constexpr (Stride == 1 && kora::kubo::detail::kConvertsFloatingToWide<A, B>) {
+        return &VectorsThenLoop<A, B, &kora::kubo::detail::ConvertFloatingToWideVectors<A, B>>;
     }
 #endif
     return &Convert<A, B, Stride>;
