@@ -35,6 +35,10 @@ TEST(RunCheckpoints, TheLastWithinALimitAndPastARun) {
     ExpectCheckpoint(checkpoints.LastWithin(UINT64_MAX, 3 * k), 4 * k, 8 * k);
     ExpectCheckpoint(checkpoints.LastWithin(UINT64_MAX, 4 * k), 0, 0);
     ExpectCheckpoint(checkpoints.LastWithin(UINT64_MAX, 100 * k), 0, 0);
+    // A seek to a bit of a run walks from the checkpoint a search within its total finds.
+    for (std::size_t run : {std::size_t{0}, k - 1, k, 3 * k + 5, 4 * k, runs.size() - 1}) {
+        EXPECT_EQ(checkpoints.WalkStart(run), checkpoints.LastWithin(2 * run + 1).run) << run;
+    }
 }
 
 TEST(RunCheckpoints, TotalsPast32BitsStayExact) {

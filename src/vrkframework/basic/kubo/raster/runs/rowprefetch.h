@@ -48,9 +48,11 @@ public:
             first - m_first < m_runCount - first) {
             m_next = first + (first - m_first);
             if (m_fetches) {
-                const std::size_t bytes =
-                    std::min({m_span * m_runBytes, kMaxBytes, (m_runCount - m_next) * m_runBytes});
-                PrefetchForReading(m_stream + m_next * m_runBytes, bytes);
+                // The seek walks from the checkpoint before the guess, then the row reads on.
+                const std::size_t from = m_checkpoints.WalkStart(m_next);
+                const std::size_t end = std::min(m_next + m_span, m_runCount);
+                const std::size_t bytes = std::min((end - from) * m_runBytes, kMaxBytes);
+                PrefetchForReading(m_stream + from * m_runBytes, bytes);
                 m_checkpoints.PrefetchNear(m_next);
             }
         }

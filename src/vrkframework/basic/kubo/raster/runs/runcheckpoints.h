@@ -122,6 +122,12 @@ public:
         return Checkpoint{(checkpoint + 1) << m_spacingBits, Total(checkpoint)};
     }
 
+    /// The run of the last checkpoint at or before `run`, where a seek to a target within
+    /// `run` starts its walk (the first run when none is).
+    std::size_t WalkStart(std::size_t run) const {
+        return std::min(CheckpointAfter(run), m_offsets.size()) << m_spacingBits;
+    }
+
     /// Asks for the checkpoint that a search guessing `nearRun` reads first to be brought
     /// into the cache.
     void PrefetchNear(std::size_t nearRun) const {
