@@ -20,6 +20,7 @@
 
 #include "vrkframework/basic/core/kernels/capabilities.h"
 #include "vrkframework/basic/core/kernels/plushalf.h"
+#include "vrkframework/basic/core/kernels/wideintegernarrowing.h"  // LowHalves
 
 #if KUBO_DETAIL_VECTOR_BITS == 256
 #include <immintrin.h>
@@ -73,11 +74,9 @@ inline __m256i EightIntoUInt32(const double* in) {
         const __m256d c = _mm256_min_pd(_mm256_max_pd(y, _mm256_setzero_pd()),
                                         _mm256_set1_pd(std::numeric_limits<std::uint32_t>::max()));
         const __m256d whole = _mm256_round_pd(c, _MM_FROUND_TO_ZERO | _MM_FROUND_NO_EXC);
-        return _mm256_castpd_ps(_mm256_add_pd(whole, _mm256_set1_pd(0x1p52)));
+        return _mm256_castpd_si256(_mm256_add_pd(whole, _mm256_set1_pd(0x1p52)));
     };
-    // The low halves, in 128-bit pieces a0 a1 b0 b1 | a2 a3 b2 b3.
-    const __m256 lows = _mm256_shuffle_ps(four(in), four(in + 4), _MM_SHUFFLE(2, 0, 2, 0));
-    return _mm256_permute4x64_epi64(_mm256_castps_si256(lows), 0xD8);
+    return LowHalves(four(in), four(in + 4));
 }
 
 /// 4 doubles truncated into 64-bit integers, as `Wide` has it: 0 at or below 0, the

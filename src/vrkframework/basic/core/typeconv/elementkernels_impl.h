@@ -11,6 +11,7 @@
 #include "vrkframework/basic/core/kernels/bytewidening.h"
 #include "vrkframework/basic/core/kernels/floatingnarrowing.h"
 #include "vrkframework/basic/core/kernels/floatingtowideintegers.h"
+#include "vrkframework/basic/core/kernels/wideintegernarrowing.h"
 #include "vrkframework/basic/core/typeconv/conversionkernels.h"
 #include "vrkframework/basic/core/typeconv/saturate.h"
 
@@ -43,7 +44,8 @@ void VectorsThenLoop(const void* src, void* dst, std::size_t count) {
 
 /// `Convert`, or vectors spelled out where the variant has them for the pair: 8-bit samples
 /// widened (bytewidening.h), floating samples narrowed (floatingnarrowing.h) and, with
-/// 256-bit vectors, converted into 32- and 64-bit integers (floatingtowideintegers.h).
+/// 256-bit vectors, floating samples converted into 32- and 64-bit integers
+/// (floatingtowideintegers.h) and 64-bit integers narrowed (wideintegernarrowing.h).
 template <class A, class B, std::size_t Stride>
 constexpr ConvertKernel SpelledOutOrConvert() {
 #if KUBO_DETAIL_WIDE_BYTE_SHUFFLES
@@ -59,6 +61,9 @@ constexpr ConvertKernel SpelledOutOrConvert() {
 #if KUBO_DETAIL_VECTOR_BITS == 256
     if constexpr (Stride == 1 && kora::kubo::detail::kConvertsFloatingToWide<A, B>) {
         return &VectorsThenLoop<A, B, &kora::kubo::detail::ConvertFloatingToWideVectors<A, B>>;
+    }
+    if constexpr (Stride == 1 && kora::kubo::detail::kNarrowsWideIntegers<A, B>) {
+        return &VectorsThenLoop<A, B, &kora::kubo::detail::NarrowWideIntegerVectors<A, B>>;
     }
 #endif
     return &Convert<A, B, Stride>;
