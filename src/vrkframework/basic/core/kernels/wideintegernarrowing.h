@@ -1,6 +1,6 @@
 // 64-bit integers narrowed into 8-, 16- and 32-bit integers with 256-bit vectors, which
 // have no 64-bit minimum and no narrowing of 64-bit lanes: a compare flags the lanes above
-// the destination's maximum (unsigned sources compare with their top bits flipped), the
+// the destination's maximum (unsigned sources compare their bits above it with 0), the
 // flagged lanes take the maximum (an or, where it is all ones in the destination's width or
 // a minimum caps the narrowed lanes) and the others keep their low bits, which shuffles then
 // gather: the pieces of two vectors into 32-bit lanes, of four into 16-bit ones, of four
@@ -17,7 +17,6 @@
 #include <immintrin.h>
 
 #include <cstddef>  // std::size_t
-#include <cstdint>  // INT64_MIN
 #include <limits>
 #include <type_traits>
 
@@ -41,9 +40,14 @@ template <class Wide, class Narrow>
 __m256i ClampFromAbove(const Wide* in) {
     constexpr long long kMax = std::numeric_limits<Narrow>::max();
     const __m256i x = _mm256_loadu_si256(reinterpret_cast<const __m256i*>(in));
-    const __m256i flip = _mm256_set1_epi64x(std::is_signed_v<Wide> ? 0 : INT64_MIN);
-    const __m256i above = _mm256_cmpgt_epi64(_mm256_xor_si256(x, flip),
-                                             _mm256_xor_si256(_mm256_set1_epi64x(kMax), flip));
+    // Unsigned sources compare the bits above the maximum's (2^k - 1) with 0: an exclusive
+    // or of the top bits would make the compiler see an unsigned compare, which it spells
+    // with one more operation.
+    constexpr int kMaxBits = std::numeric_limits<Narrow>::digits;
+    const __m256i above =
+        std::is_signed_v<Wide>
+            ? _mm256_cmpgt_epi64(x, _mm256_set1_epi64x(kMax))
+            : _mm256_cmpgt_epi64(_mm256_srli_epi64(x, kMaxBits), _mm256_setzero_si256());
     if constexpr (std::is_signed_v<Narrow> && !kCapsWhenNarrow<Wide, Narrow>) {
         return _mm256_blendv_epi8(x, _mm256_set1_epi64x(kMax), above);
     } else {
