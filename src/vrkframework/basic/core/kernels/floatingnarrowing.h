@@ -8,7 +8,9 @@
 //   32-bit lanes and narrowed by saturating packs, which clamp from below, two or four
 //   vectors at a time: a pack takes one shuffle for two vectors where a narrowing takes two
 //   for one. NaN gives 0 through a mask of the ordered lanes for signed results, and for
-//   unsigned ones through the saturation of the lowest integer it truncates to.
+//   unsigned ones through the saturation of the lowest integer it truncates to; with
+//   256-bit vectors floats bound for signed results are rounded on their magnitude, which a
+//   maximum turns to 0 for NaN, and take their signs back after the truncation.
 // The vectorised loop cannot clamp before converting (a C++ conversion of NaN is undefined),
 // so it clamps the converted lanes with compares and blends (two operations each without
 // mask registers) and narrows them through permutes. Private to the library; compiled only
@@ -116,19 +118,26 @@ __m256d ClampForPacking(__m256d y, __m256d high) {
                                     : clamped;
 }
 
-template <class Narrow>
-__m256 ClampForPacking(__m256 y, __m256 high) {
-    const __m256 clamped = _mm256_min_ps(high, y);
-    return std::is_signed_v<Narrow> ? _mm256_and_ps(clamped, _mm256_cmp_ps(y, y, _CMP_ORD_Q))
-                                    : clamped;
-}
-
-/// 8 samples rounded into 32-bit lanes for the packs into `Narrow`.
+/// 8 samples rounded into 32-bit lanes for the packs into `Narrow`. Signed results are
+/// rounded on the magnitude, which rounds like the value in both directions, clamped at
+/// the lowest value's magnitude (NaN to 0 by the operand order of a maximum), and take the
+/// samples' signs back after the truncation: one operation fewer than the sign of the half
+/// and a mask of the ordered lanes.
 template <class Narrow>
 __m256i EightForPacking(const float* in) {
-    const __m256 y = PlusHalf<std::is_signed_v<Narrow>>(_mm256_loadu_ps(in));
-    const __m256 high = _mm256_set1_ps(std::numeric_limits<Narrow>::max());
-    return _mm256_cvttps_epi32(ClampForPacking<Narrow>(y, high));
+    const __m256 x = _mm256_loadu_ps(in);
+    if constexpr (std::is_signed_v<Narrow>) {
+        const __m256 magnitude =
+            _mm256_add_ps(_mm256_andnot_ps(_mm256_set1_ps(-0.0f), x), _mm256_set1_ps(0.5f));
+        const __m256 clamped = _mm256_min_ps(
+            _mm256_max_ps(magnitude, _mm256_setzero_ps()),
+            _mm256_set1_ps(-static_cast<float>(std::numeric_limits<Narrow>::lowest())));
+        return _mm256_sign_epi32(_mm256_cvttps_epi32(clamped), _mm256_castps_si256(x));
+    } else {
+        const __m256 y = _mm256_add_ps(x, _mm256_set1_ps(0.5f));
+        return _mm256_cvttps_epi32(
+            _mm256_min_ps(_mm256_set1_ps(std::numeric_limits<Narrow>::max()), y));
+    }
 }
 
 template <class Narrow>
