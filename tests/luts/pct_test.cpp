@@ -36,6 +36,21 @@ TEST(PCT, InterpolatesEachComponentTruncatedAndClampsOutside) {
     EXPECT_EQ(Components(infinite.GetValue(-kInf)), (Rgb{10, 20, 30}));
 }
 
+TEST(PCT, InterpolatesWithinTheGapAroundTheInputOfSortedAndCopiedTables) {
+    const PCT unsorted(
+        Entries{{30, {0, 90, 255}}, {0, {100, 0, 50}}, {10, {0, 10, 60}}, {20, {200, 50, 70}}});
+    const PCT copy = unsorted;
+    for (const PCT* pct : {&unsorted, &copy}) {
+        EXPECT_EQ(Components(pct->GetValue(2.5)), (Rgb{75, 2, 52}));
+        EXPECT_EQ(Components(pct->GetValue(15)), (Rgb{100, 30, 65}));
+        EXPECT_EQ(Components(pct->GetValue(27.5)), (Rgb{50, 80, 208}));
+    }
+    std::vector<Colour> colours(256, Colour{0, 0, 0});
+    colours[200] = {10, 20, 30};
+    EXPECT_EQ(Components(PCT(colours).GetValue(199.5)), (Rgb{5, 10, 15}));
+    EXPECT_EQ(Components(PCT(colours).GetValue(200.5)), (Rgb{5, 10, 15}));
+}
+
 TEST(PCT, SharesTheLookupRulesForEqualInputsAndOrder) {
     const PCT direct(Entries{{1, {1, 1, 1}}, {1, {2, 2, 2}}, {2, {4, 4, 4}}});
     EXPECT_EQ(Components(direct.GetValue(1)), (Rgb{2, 2, 2}));

@@ -78,6 +78,11 @@ public:
 private:
     // The colour comes back as red | green << 8 | blue << 16, which travels in a register.
     std::uint32_t GetSearchedColour(double x) const;
+
+    /// For the gap below each breakpoint after the first, its colour's components less
+    /// those of the breakpoint before, then those of the breakpoint before: six doubles a
+    /// gap, read where a search lands between two breakpoints.
+    std::vector<double> m_gaps;
 };
 
 /// True when `pct` has 256 breakpoints with the inputs 0 to 255, whatever their colours.

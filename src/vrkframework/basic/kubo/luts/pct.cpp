@@ -1,8 +1,9 @@
 // Pseudocolour table construction, lookup and the classic-table test.
 #include "vrkframework/basic/kubo/luts/pct.h"
 
-#include <array>
-#include <cstdint>  // std::uint32_t
+#include <cstddef>   // std::size_t
+#include <cstdint>   // std::uint32_t
+#include <iterator>  // std::begin, std::end
 
 #include "vrkframework/basic/kubo/luts/breakpoints.h"
 #include "vrkframework/platform/exception.h"
@@ -36,22 +37,30 @@ std::vector<PCT::Colour> InterleavePlanes(const unsigned char* planes) {
     return colours;
 }
 
-// Bytes as doubles. Reading them from a table is cheaper than converting, which would
-// compete with the three truncations of a blend for the same conversion units.
-constexpr auto kByteValues = [] {
-    std::array<double, 256> values{};
-    for (std::size_t i = 0; i < values.size(); ++i) {
-        values[i] = static_cast<double>(i);
+// The six doubles of each gap between neighbouring breakpoints (see PCT::m_gaps): the
+// difference of two whole components is exact, so a falling component comes out right.
+std::vector<double> Gaps(const std::vector<PCT::Entry>& entries) {
+    std::vector<double> gaps;
+    gaps.reserve(6 * (entries.size() - 1));
+    for (std::size_t i = 1; i < entries.size(); ++i) {
+        const PCT::Colour& lower = entries[i - 1].second;
+        const PCT::Colour& upper = entries[i].second;
+        const double lowers[] = {static_cast<double>(lower.r), static_cast<double>(lower.g),
+                                 static_cast<double>(lower.b)};
+        const double uppers[] = {static_cast<double>(upper.r), static_cast<double>(upper.g),
+                                 static_cast<double>(upper.b)};
+        for (std::size_t c = 0; c < 3; ++c) {
+            gaps.push_back(uppers[c] - lowers[c]);
+        }
+        gaps.insert(gaps.end(), std::begin(lowers), std::end(lowers));
     }
-    return values;
-}();
+    return gaps;
+}
 
-// (upper - lower) x t + lower: the difference of two whole doubles is the exact signed
-// difference, so a falling component comes out right. With t in [0, 1] the result lies
-// between the two components, so it truncates to a byte value without any masking.
-std::uint32_t Blend(unsigned char lower, unsigned char upper, double t) {
-    const double from = kByteValues[lower];
-    return static_cast<std::uint32_t>(static_cast<int>((kByteValues[upper] - from) * t + from));
+// difference x t + lower: with t in [0, 1] the result lies between the two components, so
+// it truncates to a byte value without any masking.
+std::uint32_t Blend(double difference, double lower, double t) {
+    return static_cast<std::uint32_t>(static_cast<int>(difference * t + lower));
 }
 
 // The colour travels as red | green << 8 | blue << 16: an integer is returned in a register,
@@ -65,7 +74,8 @@ std::uint32_t Pack(const PCT::Colour& colour) { return Pack(colour.r, colour.g, 
 }  // namespace
 
 PCT::PCT(const std::vector<Colour>& colours)
-    : BreakpointTable(detail::ClassicEntries<Entry>(ClassicColours(colours))) {}
+    : BreakpointTable(detail::ClassicEntries<Entry>(ClassicColours(colours))),
+      m_gaps(Gaps(m_entries)) {}
 
 PCT::PCT(const std::vector<Entry>& entries) : BreakpointTable(entries) {
     if (entries.size() < 2) {
@@ -78,6 +88,7 @@ PCT::PCT(const std::vector<Entry>& entries) : BreakpointTable(entries) {
             "std::pair<double,struct kora::kubo::RGBTuple<unsigned char> > > > &)",
             80);
     }
+    m_gaps = Gaps(m_entries);
 }
 
 PCT::PCT(const unsigned char* planes)
@@ -85,7 +96,8 @@ PCT::PCT(const unsigned char* planes)
           InterleavePlanes(
               detail::CheckedTableBytes(planes, kSourcePath,
                                         "__cdecl kora::kubo::PCT::PCT(const unsigned char *)"))
-              .data())) {}
+              .data())),
+      m_gaps(Gaps(m_entries)) {}
 
 std::uint32_t PCT::GetSearchedColour(double x) const {
     const detail::Bracket at = detail::Search(m_entries, m_inputBlocks, x);
@@ -100,8 +112,8 @@ std::uint32_t PCT::GetSearchedColour(double x) const {
     // so that no conversion overflows.
     const double below = position < 1.0 ? position : 1.0;
     const double t = below > 0.0 ? below : 0.0;
-    return Pack(Blend(lower.second.r, upper.second.r, t), Blend(lower.second.g, upper.second.g, t),
-                Blend(lower.second.b, upper.second.b, t));
+    const double* gap = &m_gaps[6 * (at.index - 1)];
+    return Pack(Blend(gap[0], gap[3], t), Blend(gap[1], gap[4], t), Blend(gap[2], gap[5], t));
 }
 
 bool IsClassicPCT(const PCT& pct) { return detail::HasClassicInputs(pct.GetEntries()); }
