@@ -121,18 +121,27 @@ public:
     /// end in the run that holds the bit or at the start of the next one, which read the
     /// same bits from there and leave the same cursor as `end` does.
     void ResumeAt(const Cursor& end, std::uint64_t bit) {
-        if (end.position == bit && end.runIndex + 1 < m_size) {
+        if (Resumes(end, bit)) {
             m_cursor = end;
         }
     }
 
-    void Read(std::uint64_t byteOffset, std::uint64_t byteCount, unsigned char* dst) {
+    /// Reads `byteCount` bytes from `byteOffset` on into `dst` and leaves the cursor where
+    /// the read ended in `end`. `nextEnd` is where a read of the next row ended: when that
+    /// row will take up from there at `nextBit`, its runs are fetched from there rather than
+    /// from the checkpoint a seek would walk from.
+    void Read(std::uint64_t byteOffset, std::uint64_t byteCount, unsigned char* dst, Cursor& end,
+              const Cursor& nextEnd, std::uint64_t nextBit) {
         // A cursor inside the stream that stands at the bit already stays: the seek would
         // move nothing.
         if (m_cursor.position != byteOffset * 8 || m_cursor.runIndex >= m_size) {
             Seek(byteOffset * 8);
         }
-        m_prefetch.RowStarts(m_cursor.runIndex);
+        if (Resumes(nextEnd, nextBit)) {
+            m_prefetch.RowStarts(m_cursor.runIndex, nextEnd.runIndex);
+        } else {
+            m_prefetch.RowStarts(m_cursor.runIndex);
+        }
         // The bits go out run by run. A run is entered only when a bit of it is read, so the
         // cursor ends in the run that holds the last bit read, as read bit by bit: the run
         // the cursor stands in is read on, then the runs after it that are read whole.
@@ -157,9 +166,21 @@ public:
         }
         writer.Finish();
         m_prefetch.RowEnds(m_cursor.runIndex);
+        // Field by field: copied whole, the cursor just stored back into the reader is read
+        // in wide loads across its narrower stores, which cannot take their data from them.
+        end.runIndex = m_cursor.runIndex;
+        end.position = m_cursor.position;
+        end.runLength = m_cursor.runLength;
+        end.consumed = m_cursor.consumed;
+        end.bitValue = m_cursor.bitValue;
     }
 
 private:
+    /// Whether a read at `bit` takes up `end` (see ResumeAt).
+    bool Resumes(const Cursor& end, std::uint64_t bit) const {
+        return end.position == bit && end.runIndex + 1 < m_size;
+    }
+
     // Reads the runs after the cursor's run, which has been read to its end, one mark each,
     // as long as each lies in the stream and is read whole, and bits are left to read before
     // it: the steps of the read would enter each (also a separator, whose run after it then
@@ -169,6 +190,16 @@ private:
         std::uint64_t position = m_cursor.position;
         bool value = m_cursor.bitValue;
         while (left > 0 && run + 1 < m_size && m_runs[run + 1] <= left) {
+            // A separator and the run after it read whole leave the value as it was: one step
+            // for both, as long stretches of one value are pairs of 255 and 0.
+            if (m_runs[run + 1] == 0 && run + 2 < m_size && m_runs[run + 2] <= left) {
+                const std::uint32_t joined = m_runs[run + 2];
+                run += 2;
+                writer.Put(joined, value);
+                position += joined;
+                left -= joined;
+                continue;
+            }
             const std::uint32_t length = m_runs[++run];
             value = !value;
             if (length != 0) {  // a separator: the bits around it join without a change
@@ -392,8 +423,9 @@ void BitwiseRLECompressedData::DecodeWindow(int x, int y, int w, int h, unsigned
             Cursor& rowEnd = m_rowEnds[static_cast<std::uint64_t>(row) % kRowEndSlots];
             reader.ResumeAt(rowEnd, offset * 8);
             reader.Read(offset, static_cast<std::uint64_t>(std::min(rowBytes, capacity - o)),
-                        out + o);
-            rowEnd = reader.Where();
+                        out + o, rowEnd,
+                        m_rowEnds[static_cast<std::uint64_t>(row + 1) % kRowEndSlots],
+                        (offset + lineSize) * 8);
         }
     } catch (...) {
         m_cursor = reader.Where();
