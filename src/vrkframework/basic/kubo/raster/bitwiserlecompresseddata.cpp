@@ -128,8 +128,8 @@ public:
 
     /// Reads `byteCount` bytes from `byteOffset` on into `dst` and leaves the cursor where
     /// the read ended in `end`. `nextEnd` is where a read of the next row ended: when that
-    /// row will take up from there at `nextBit`, its runs are fetched from there rather than
-    /// from the checkpoint a seek would walk from.
+    /// row will take up from there at `nextBit`, it needs no seek and nothing is fetched
+    /// ahead for it.
     void Read(std::uint64_t byteOffset, std::uint64_t byteCount, unsigned char* dst, Cursor& end,
               const Cursor& nextEnd, std::uint64_t nextBit) {
         // A cursor inside the stream that stands at the bit already stays: the seek would
