@@ -20,6 +20,7 @@
 #define VRKFRAMEWORK_BASIC_CORE_KERNELS_FLOATINGNARROWING_H
 
 #include "vrkframework/basic/core/kernels/capabilities.h"
+#include "vrkframework/basic/core/kernels/lanepieces.h"
 #include "vrkframework/basic/core/kernels/plushalf.h"
 
 #if KUBO_DETAIL_VECTOR_BITS >= 256
@@ -162,9 +163,8 @@ void NarrowIntoHalfALine(const Floating* in, Narrow* out) {
     __m256i half;
     if constexpr (sizeof(Narrow) == 2) {
         // Pieces of 4 words: a0 b0 a1 b1.
-        half = _mm256_permute4x64_epi64(
-            PackIntoWords<Narrow>(EightForPacking<Narrow>(in), EightForPacking<Narrow>(in + 8)),
-            0xD8);
+        half = PiecesOfEightInOrder(
+            PackIntoWords<Narrow>(EightForPacking<Narrow>(in), EightForPacking<Narrow>(in + 8)));
     } else {
         // Pieces of 4 bytes: a0 b0 c0 d0 a1 b1 c1 d1.
         const __m256i first =
@@ -173,7 +173,7 @@ void NarrowIntoHalfALine(const Floating* in, Narrow* out) {
                                                      EightForPacking<Narrow>(in + 24));
         const __m256i bytes = std::is_signed_v<Narrow> ? _mm256_packs_epi16(first, second)
                                                        : _mm256_packus_epi16(first, second);
-        half = _mm256_permutevar8x32_epi32(bytes, _mm256_set_epi32(7, 3, 6, 2, 5, 1, 4, 0));
+        half = PiecesOfFourInOrder(bytes);
     }
     _mm256_storeu_si256(reinterpret_cast<__m256i*>(out), half);
 }

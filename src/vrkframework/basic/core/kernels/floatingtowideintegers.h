@@ -19,8 +19,8 @@
 #define VRKFRAMEWORK_BASIC_CORE_KERNELS_FLOATINGTOWIDEINTEGERS_H
 
 #include "vrkframework/basic/core/kernels/capabilities.h"
+#include "vrkframework/basic/core/kernels/lanepieces.h"
 #include "vrkframework/basic/core/kernels/plushalf.h"
-#include "vrkframework/basic/core/kernels/wideintegernarrowing.h"  // LowHalves
 
 #if KUBO_DETAIL_VECTOR_BITS == 256
 #include <immintrin.h>

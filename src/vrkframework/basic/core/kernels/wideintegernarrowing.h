@@ -12,6 +12,7 @@
 #define VRKFRAMEWORK_BASIC_CORE_KERNELS_WIDEINTEGERNARROWING_H
 
 #include "vrkframework/basic/core/kernels/capabilities.h"
+#include "vrkframework/basic/core/kernels/lanepieces.h"
 
 #if KUBO_DETAIL_VECTOR_BITS == 256
 #include <immintrin.h>
@@ -55,14 +56,6 @@ __m256i ClampFromAbove(const Wide* in) {
     }
 }
 
-/// The low halves of the 64-bit lanes of `a`, then of `b`.
-inline __m256i LowHalves(__m256i a, __m256i b) {
-    // In 128-bit pieces a0 a1 b0 b1 | a2 a3 b2 b3.
-    const __m256 halves =
-        _mm256_shuffle_ps(_mm256_castsi256_ps(a), _mm256_castsi256_ps(b), _MM_SHUFFLE(2, 0, 2, 0));
-    return _mm256_permute4x64_epi64(_mm256_castps_si256(halves), 0xD8);
-}
-
 /// The low `Narrow` of each 32-bit lane of `lanes` moved into slot `k` (of the slots of
 /// 4 bytes for bytes, of 8 for words) of each 128-bit piece, the rest of it cleared.
 template <class Narrow>
@@ -93,13 +86,13 @@ void NarrowWideIntoHalfALine(const Wide* in, Narrow* out) {
         // Pieces of 8 bytes: a0 b0 | a1 b1.
         const __m256i pieces =
             _mm256_or_si256(IntoSlot<Narrow>(halves(0), 0), IntoSlot<Narrow>(halves(1), 1));
-        line = _mm256_permute4x64_epi64(pieces, 0xD8);
+        line = PiecesOfEightInOrder(pieces);
     } else {
         // Pieces of 4 bytes: a0 b0 c0 d0 | a1 b1 c1 d1.
         const __m256i pieces = _mm256_or_si256(
             _mm256_or_si256(IntoSlot<Narrow>(halves(0), 0), IntoSlot<Narrow>(halves(1), 1)),
             _mm256_or_si256(IntoSlot<Narrow>(halves(2), 2), IntoSlot<Narrow>(halves(3), 3)));
-        line = _mm256_permutevar8x32_epi32(pieces, _mm256_setr_epi32(0, 4, 1, 5, 2, 6, 3, 7));
+        line = PiecesOfFourInOrder(pieces);
     }
     if constexpr (kCapsWhenNarrow<Wide, Narrow>) {
         const auto cap = static_cast<int>(std::numeric_limits<Narrow>::max());
