@@ -147,6 +147,7 @@ TEST(LineRLECompressedBitMask, WindowsFarAlongLongRowsAreSlicesOfTheMask) {
     const unsigned int height = 3;
     Bytes flags = Flags(kubo_test::RunBytes(width * height, 9, {0, 1}, 6));
     std::fill_n(flags.begin() + width + 20000, 3000, 1);
+    std::fill_n(flags.begin() + width + 23500, 3000, 0);
     const LineRLECompressedBitMask mask = MaskOf(flags, width, height);
     ASSERT_GT(mask.GetCompressedRowSize(1), 4096u);
     std::mt19937 random(3);
@@ -171,6 +172,9 @@ TEST(LineRLECompressedBitMask, WindowsFarAlongLongRowsAreSlicesOfTheMask) {
                 << x;
         }
     }
+    // Windows too wide to be filled ahead, over long pieces of either value.
+    EXPECT_EQ(Window(mask, 19000, 1, 5000, 1), kubo_test::Slice(flags, width, 19000, 1, 5000, 1));
+    EXPECT_EQ(Window(mask, 0, 0, width, 3), flags);
     EXPECT_EQ(Window(mask, width, 2, 2, 1), (Bytes{0, 0}));
     Bytes out(1);
     EXPECT_THROW(mask.Decode(width + 1, 2, 1, 1, out.data()), kora::DataException);
