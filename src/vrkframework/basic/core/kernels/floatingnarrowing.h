@@ -2,15 +2,16 @@
 // added in the source precision, then:
 // - with 512-bit vectors, doubles are clamped in their lanes, where minimum and maximum let
 //   NaN through in the chosen operand order, truncated into 64-bit lanes (NaN into the
-//   lowest integer, whose low bytes are 0, as the rules have it) and narrowed by keeping
-//   the low bytes;
-// - floats, and doubles with 256-bit vectors, are clamped from above only, truncated into
-//   32-bit lanes and narrowed by saturating packs, which clamp from below, two or four
-//   vectors at a time: a pack takes one shuffle for two vectors where a narrowing takes two
-//   for one. NaN gives 0 through a mask of the ordered lanes for signed results, and for
-//   unsigned ones through the saturation of the lowest integer it truncates to; with
-//   256-bit vectors floats bound for signed results are rounded on their magnitude, which a
-//   maximum turns to 0 for NaN, and take their signs back after the truncation.
+//   lowest integer, whose low half is 0, as the rules have it), and the low halves of two
+//   vectors are gathered into one by a two-source permute;
+// - floats, and doubles with 256-bit vectors, are clamped from above only and truncated
+//   into 32-bit lanes. NaN gives 0 through a mask of the ordered lanes for signed results,
+//   and for unsigned ones through the saturation of the lowest integer it truncates to;
+//   with 256-bit vectors floats bound for signed results are rounded on their magnitude,
+//   which a maximum turns to 0 for NaN, and take their signs back after the truncation.
+// The 32-bit lanes are narrowed by saturating packs, which clamp floats from below, two or
+// four vectors at a time: a pack takes one shuffle for two vectors where a narrowing of
+// 64-bit lanes takes two for one.
 // The vectorised loop cannot clamp before converting (a C++ conversion of NaN is undefined),
 // so it clamps the converted lanes with compares and blends (two operations each without
 // mask registers) and narrows them through permutes. Private to the library; compiled only
@@ -45,30 +46,9 @@ constexpr bool kNarrowsFloating = std::is_floating_point_v<Floating>&& std::is_i
 constexpr __mmask8 kEightLanes = 0xFF;
 constexpr __mmask16 kSixteenLanes = 0xFFFF;
 
-/// Rounds 8 doubles into `out`.
-template <class Narrow>
-void NarrowEightDoubles(const double* in, Narrow* out) {
-    constexpr bool kSigned = std::is_signed_v<Narrow>;
-    const __m512d high = _mm512_set1_pd(std::numeric_limits<Narrow>::max());
-    const __m512d low = _mm512_set1_pd(std::numeric_limits<Narrow>::lowest());
-    const __m512d y = PlusHalf<kSigned>(_mm512_loadu_pd(in));
-    // Where either operand is NaN, minimum and maximum return the second.
-    const __m512d clamped =
-        kSigned ? _mm512_maskz_max_pd(kEightLanes, low, _mm512_maskz_min_pd(kEightLanes, high, y))
-                : _mm512_maskz_min_pd(kEightLanes, high, _mm512_maskz_max_pd(kEightLanes, y, low));
-    const __m512i lanes = _mm512_maskz_cvttpd_epi64(kEightLanes, clamped);
-    if constexpr (sizeof(Narrow) == 1) {
-        const __m128i narrow = _mm512_maskz_cvtepi64_epi8(kEightLanes, lanes);
-        std::memcpy(out, &narrow, 8);
-    } else {
-        _mm_storeu_si128(reinterpret_cast<__m128i*>(out),
-                         _mm512_maskz_cvtepi64_epi16(kEightLanes, lanes));
-    }
-}
-
 /// 16 floats rounded into 32-bit lanes for the packs into `Narrow`.
 template <class Narrow>
-__m512i TruncateSixteenFloats(const float* in) {
+__m512i SixteenForPacking(const float* in) {
     const __m512 y = PlusHalf<std::is_signed_v<Narrow>>(_mm512_loadu_ps(in));
     const __m512 high = _mm512_set1_ps(std::numeric_limits<Narrow>::max());
     const __m512 clamped = _mm512_maskz_min_ps(kSixteenLanes, high, y);  // NaN stays NaN
@@ -79,28 +59,50 @@ __m512i TruncateSixteenFloats(const float* in) {
     }
 }
 
+/// 16 doubles rounded into 32-bit lanes for the packs into `Narrow`: clamped at both ends
+/// in their own lanes, truncated into 64-bit lanes (NaN into the lowest integer, whose low
+/// half is 0), whose low halves one two-source permute gathers.
+template <class Narrow>
+__m512i SixteenForPacking(const double* in) {
+    constexpr bool kSigned = std::is_signed_v<Narrow>;
+    const __m512d high = _mm512_set1_pd(std::numeric_limits<Narrow>::max());
+    const __m512d low = _mm512_set1_pd(std::numeric_limits<Narrow>::lowest());
+    const auto eight = [&](const double* at) {
+        const __m512d y = PlusHalf<kSigned>(_mm512_loadu_pd(at));
+        // Where either operand is NaN, minimum and maximum return the second.
+        const __m512d clamped =
+            kSigned
+                ? _mm512_maskz_max_pd(kEightLanes, low, _mm512_maskz_min_pd(kEightLanes, high, y))
+                : _mm512_maskz_min_pd(kEightLanes, high, _mm512_maskz_max_pd(kEightLanes, y, low));
+        return _mm512_maskz_cvttpd_epi64(kEightLanes, clamped);
+    };
+    const __m512i lowHalves =
+        _mm512_set_epi32(30, 28, 26, 24, 22, 20, 18, 16, 14, 12, 10, 8, 6, 4, 2, 0);
+    return _mm512_maskz_permutex2var_epi32(kSixteenLanes, eight(in), lowHalves, eight(in + 8));
+}
+
 template <class Narrow>
 __m512i PackIntoWords(__m512i a, __m512i b) {
     return std::is_signed_v<Narrow> ? _mm512_packs_epi32(a, b) : _mm512_packus_epi32(a, b);
 }
 
-/// Rounds 64 bytes' worth of floats into `out`. The packs work within 128-bit lanes, so
+/// Rounds 64 bytes' worth of samples into `out`. The packs work within 128-bit lanes, so
 /// the pieces of the operands come out interleaved and one permute puts them in order.
-template <class Narrow>
-void NarrowFloatsIntoALine(const float* in, Narrow* out) {
+template <class Narrow, class Floating>
+void NarrowIntoALine(const Floating* in, Narrow* out) {
     __m512i line;
     if constexpr (sizeof(Narrow) == 2) {
         // Pieces of 4 words: a0 b0 a1 b1 a2 b2 a3 b3.
-        const __m512i words = PackIntoWords<Narrow>(TruncateSixteenFloats<Narrow>(in),
-                                                    TruncateSixteenFloats<Narrow>(in + 16));
+        const __m512i words = PackIntoWords<Narrow>(SixteenForPacking<Narrow>(in),
+                                                    SixteenForPacking<Narrow>(in + 16));
         line = _mm512_maskz_permutexvar_epi64(kEightLanes, _mm512_set_epi64(7, 5, 3, 1, 6, 4, 2, 0),
                                               words);
     } else {
         // Pieces of 4 bytes: a0 b0 c0 d0 a1 b1 c1 d1 ...
-        const __m512i first = PackIntoWords<Narrow>(TruncateSixteenFloats<Narrow>(in),
-                                                    TruncateSixteenFloats<Narrow>(in + 16));
-        const __m512i second = PackIntoWords<Narrow>(TruncateSixteenFloats<Narrow>(in + 32),
-                                                     TruncateSixteenFloats<Narrow>(in + 48));
+        const __m512i first = PackIntoWords<Narrow>(SixteenForPacking<Narrow>(in),
+                                                    SixteenForPacking<Narrow>(in + 16));
+        const __m512i second = PackIntoWords<Narrow>(SixteenForPacking<Narrow>(in + 32),
+                                                     SixteenForPacking<Narrow>(in + 48));
         const __m512i bytes = std::is_signed_v<Narrow> ? _mm512_packs_epi16(first, second)
                                                        : _mm512_packus_epi16(first, second);
         line = _mm512_maskz_permutexvar_epi32(
@@ -188,19 +190,14 @@ template <class Floating, class Narrow>
 std::size_t NarrowFloatingVectors(const Floating* in, Narrow* out, std::size_t count) {
     static_assert(kNarrowsFloating<Floating, Narrow>);
 #if KUBO_DETAIL_VECTOR_BITS == 512
-    constexpr bool kDouble = sizeof(Floating) == 8;
-    constexpr std::size_t kStep = kDouble ? 8 : 64 / sizeof(Narrow);
+    constexpr std::size_t kStep = 64 / sizeof(Narrow);
 #else
     constexpr std::size_t kStep = 32 / sizeof(Narrow);
 #endif
     std::size_t i = 0;
     for (; i + kStep <= count; i += kStep) {
 #if KUBO_DETAIL_VECTOR_BITS == 512
-        if constexpr (kDouble) {
-            NarrowEightDoubles(in + i, out + i);
-        } else {
-            NarrowFloatsIntoALine(in + i, out + i);
-        }
+        NarrowIntoALine(in + i, out + i);
 #else
         NarrowIntoHalfALine(in + i, out + i);
 #endif
