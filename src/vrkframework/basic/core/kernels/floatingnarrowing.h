@@ -28,7 +28,6 @@
 #include <immintrin.h>
 
 #include <cstddef>  // std::size_t
-#include <cstring>  // std::memcpy
 #include <limits>
 #include <type_traits>
 
